@@ -1,0 +1,6 @@
+#include "frame/frame.h"
+
+int VLUnloadFile(void *block) {
+  vl::release(block);
+  return 0;
+}

@@ -1,0 +1,25 @@
+// Languages and territories from the C library's locale sources.
+#pragma once
+#include <cstdint>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "container.h"
+
+namespace mkdefs {
+
+struct DefObject {
+  uint8_t type = 0;            // 0 language, 1 territory
+  uint16_t id = 0;
+  std::string name;            // control file name, e.g. "German", "Germany"
+  std::vector<Bytes> sections; // big-endian, section 0 is the body
+};
+
+// codePageId maps a code page name as the native locale table writes it ("Latin1",
+// "MS932", ...) to its object id, or 0 when there is no such code page.
+bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
+                                  const std::function<uint16_t(const std::string &)> &codePageId,
+                                  std::vector<DefObject> *out, std::string *err);
+
+}  // namespace mkdefs
