@@ -1,0 +1,139 @@
+// Locale handles: names, defaults, fallbacks, codes, and changes of territory or code page.
+#include <gtest/gtest.h>
+
+#include "locale/locale.h"
+#include "support/defdir.h"
+#include "support/hooks.h"
+
+namespace {
+
+class Locale : public ::testing::Test {
+ protected:
+  static void SetUpTestSuite() {
+    dir_ = new ts::TempDir;
+    ts::DefDir::standard().write(dir_->path, "Latin1 ISO-8859-1 8859-1\n  CP819\nIBM-930 CP930\n");
+  }
+  static void TearDownTestSuite() { delete dir_; }
+  void SetUp() override { lib_ = std::make_unique<ts::Library>(dir_->path.c_str()); }
+  void TearDown() override {
+    lib_.reset();
+    EXPECT_EQ(ts::hooks.live, 0);
+  }
+  static ts::TempDir *dir_;
+  std::unique_ptr<ts::Library> lib_;
+};
+ts::TempDir *Locale::dir_;
+
+std::string describe(const VLLocale *l) {
+  return std::string(l->language->name) + "_" + l->territory->name + "." + l->codePage->name + "@" +
+         (l->sort ? l->sort->name : "Binary");
+}
+
+TEST_F(Locale, NamesDefaultsAndCodes) {
+  struct Case {
+    const char *name;
+    uint32_t options;
+    uint32_t rc;
+    const char *expect;  // null when no handle comes back
+  } cases[] = {
+      {"", 0, 0, "English_UnitedStates.US-ASCII@Binary"},
+      {"German", 0, 0, "German_Germany.Latin1@Binary"},
+      {"German_UnitedStates", 0, 0, "German_UnitedStates.Latin1@Binary"},
+      {"german_unitedstates.ms932", 0, 0, "German_UnitedStates.MS932@Binary"},
+      {"English_UnitedStates.US-ASCII@BINARY", 0, 0, "English_UnitedStates.US-ASCII@Binary"},
+      {"English@binary", 0, 0, "English_UnitedStates.US-ASCII@Binary"},
+      {"German.ISO-8859-1", 0, 0, "German_Germany.Latin1@Binary"},  // an alias
+      {"German.cp819", 0, 0, "German_Germany.Latin1@Binary"},       // a continuation-line alias
+      {"Klingon", 0, VL_RC_NOLANGUAGE, nullptr},
+      {"Klingon", VL_LOCALE_FALLBACK, 0, "English_UnitedStates.US-ASCII@Binary"},
+      {"German_Atlantis", 0, VL_RC_NOTERRITORY, nullptr},
+      {"German_Atlantis", VL_LOCALE_FALLBACK, 0, "German_Germany.Latin1@Binary"},
+      {"German_Germany.EBCDIC-X", 0, VL_RC_NOCODEPAGE, nullptr},
+      {"German_Germany.EBCDIC-X", VL_LOCALE_FALLBACK, 0, "German_Germany.Latin1@Binary"},
+      {"German@Phonebook", 0, VL_RC_NOSORT, nullptr},
+      {"German@Phonebook", VL_LOCALE_FALLBACK, 0, "German_Germany.Latin1@Binary"},
+      {"German", 0x1, VL_RC_BADARG, nullptr},
+      {"German", 0x8, VL_RC_BADARG, nullptr},
+  };
+  for (const auto &c : cases) {
+    uint32_t rc = 77;
+    VLLocale *l = VLGetLocale(c.name, c.options, &rc);
+    EXPECT_EQ(rc, c.rc) << c.name;
+    if (!c.expect) {
+      EXPECT_EQ(l, nullptr) << c.name;
+      continue;
+    }
+    ASSERT_NE(l, nullptr) << c.name;
+    EXPECT_EQ(describe(l), c.expect) << c.name;
+    EXPECT_EQ(VLGetError(l), 0);
+    EXPECT_EQ(VLReleaseLocale(l), 0u);
+  }
+}
+
+TEST_F(Locale, WideAndUtf16NamesAgree) {
+  const char *names[] = {"German_UnitedStates.MS932", "english", "German.CP819", ""};
+  for (const char *n : names) {
+    std::vector<VLWChar> w(n, n + std::strlen(n) + 1);
+    std::vector<VLUChar> u(n, n + std::strlen(n) + 1);
+    uint32_t r1, r2, r3;
+    VLLocale *a = VLGetLocale(n, 0, &r1), *b = VLGetLocaleW(w.data(), 0, &r2), *c = VLGetLocaleU(u.data(), 0, &r3);
+    ASSERT_TRUE(a && b && c) << n;
+    EXPECT_EQ(describe(a), describe(b));
+    EXPECT_EQ(describe(a), describe(c));
+    for (VLLocale *l : {a, b, c}) VLReleaseLocale(l);
+  }
+  const VLUChar accented[] = {u'G', 0x0165, 0};  // no such name; low byte must not match anything
+  uint32_t rc;
+  EXPECT_EQ(VLGetLocaleU(accented, 0, &rc), nullptr);
+  EXPECT_EQ(rc, VL_RC_NOLANGUAGE);
+}
+
+TEST_F(Locale, ModifiableValuesFollowTerritoryAndCodePage) {
+  uint32_t rc;
+  VLLocale *l = VLGetLocale("German_Germany.Latin1", 0, &rc);
+  ASSERT_NE(l, nullptr);
+  EXPECT_EQ(l->chars[2], ',');
+  EXPECT_EQ(l->chars[3], '.');
+  EXPECT_STREQ(l->texts[1], "\xA4") << "euro sign is not in this page: substitution";
+  EXPECT_EQ(l->textsU[1][0], 0x20AC);
+  EXPECT_EQ(l->flags & 0x3F, 0x05);  // flags word 0x0A shifted down by one
+
+  uint32_t crc;
+  VLObjEntry *us = VLGetObjFromName(vlglobals->objManager, 1, "UnitedStates", 12, 0, &crc);
+  EXPECT_EQ(VLLocaleChangeTerritory(l, us), 0u);
+  EXPECT_EQ(l->chars[2], '.');
+  EXPECT_STREQ(l->texts[1], "$");
+
+  // To the shift-sensitive page: texts are converted, punctuation must stay single-byte.
+  VLObjEntry *ebcdic = VLGetObjFromID(vlglobals->objManager, 2, 930, 0, &crc);
+  EXPECT_EQ(VLLocaleChangeCodePage(l, ebcdic), VL_RC_NOSBCSPUNCT) << "'.' has no form in this test page";
+  EXPECT_STREQ(l->codePage->name, "Latin1");
+  EXPECT_STREQ(l->texts[1], "$");
+  VLObjEntry *dbcs = VLGetObjFromID(vlglobals->objManager, 2, 932, 0, &crc);
+  EXPECT_EQ(VLLocaleChangeCodePage(l, dbcs), 0u);
+  EXPECT_EQ(l->flags & (VL_LF_SINGLEBYTE | VL_LF_SHIFT), 0);
+  EXPECT_STREQ(l->texts[5], "%H:%M:%S");
+  EXPECT_EQ(VLReleaseLocale(l), 0u);
+}
+
+TEST_F(Locale, ShiftSensitiveTexts) {
+  ts::TempDir d;
+  ts::DefDir defs = ts::DefDir::standard();
+  defs.objects[0].sections[0] = ts::languageBody(840, 930, 0, u"en", u"English");
+  defs.objects[3].sections[0] = ts::territoryBody(u"A\u4E00\u4E01B", u"US", ' ', ' ');
+  defs.write(d.path);
+  lib_.reset();
+  ts::Library lib(d.path.c_str());
+  uint32_t rc;
+  VLLocale *l = VLGetLocale("English", 0, &rc);
+  ASSERT_NE(l, nullptr);
+  EXPECT_EQ(l->flags & VL_LF_SHIFT, VL_LF_SHIFT);
+  EXPECT_STREQ(l->texts[1], "\xC1\x0E\x45\x41\x45\x42\x0F\xC2");
+  char out[32];
+  VLObjEntry *latin = VLGetObjFromID(vlglobals->objManager, 2, 819, 0, &rc);
+  EXPECT_EQ(VLLocaleCnvText(l->codePage, latin, l->texts[1], out), 5);
+  EXPECT_STREQ(out, "A\x1A\x1A" "B");
+  VLReleaseLocale(l);
+}
+
+}  // namespace
