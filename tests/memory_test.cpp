@@ -54,7 +54,9 @@ TEST(Memory, EachFailingAllocationIsReportedAndLeaksNothing) {
     EXPECT_EQ(ts::hooks.live, 0) << "allocation " << k;
     // A failed load of an object falls back to the built-in body (and its code is the
     // load's); everything else must say 20.
-    if (rc != 0) EXPECT_EQ(rc, VL_RC_NOMEM) << "allocation " << k;
+    if (rc != 0) {
+      EXPECT_EQ(rc, VL_RC_NOMEM) << "allocation " << k;
+    }
   }
 }
 
