@@ -61,11 +61,11 @@ int maxMasked(unsigned lo, unsigned hi, unsigned mask) {
 // Walks a trie level by level from the root. Each node is examined once per level, and a
 // node still inner at the fourth level is refused, so cycles cannot hide.
 template <class NodeAt>
-bool trieOk(uint32_t nodes, uint32_t leaves, NodeAt nodeAt) {
-  if (nodes == 0) return false;
+uint32_t trieCheck(uint32_t nodes, uint32_t leaves, NodeAt nodeAt) {
+  if (nodes == 0) return kBad;
   vl::Block<uint8_t> seen(nodes);
   vl::Block<uint8_t> next(nodes);
-  if (!seen || !next) return false;
+  if (!seen || !next) return VL_RC_NOMEM;
   std::memset(seen.get(), 0, nodes);
   seen.get()[0] = 1;
   for (int depth = 0; depth < 4; ++depth) {
@@ -78,17 +78,17 @@ bool trieOk(uint32_t nodes, uint32_t leaves, NodeAt nodeAt) {
       if (top < 0) continue;
       uint32_t last = node.base + static_cast<uint32_t>(top);
       if (node.leaf) {
-        if (last >= leaves) return false;
+        if (last >= leaves) return kBad;
         continue;
       }
-      if (depth == 3 || last >= nodes) return false;
+      if (depth == 3 || last >= nodes) return kBad;
       for (unsigned b = node.lo; b <= node.hi && b < 256; ++b) next.get()[node.base + (b & node.mask)] = 1;
       any = true;
     }
-    if (!any) return true;
+    if (!any) return 0;
     std::memcpy(seen.get(), next.get(), nodes);
   }
-  return true;
+  return 0;
 }
 
 struct NodeView {
@@ -164,11 +164,11 @@ uint32_t checkCodePage(VLObjEntry *e) {
     for (uint32_t i = 0; i < nodes; ++i) swap16(b + start[2] + 4 * i + 2);
     for (uint32_t i = 0; i < records * 2; ++i) swap32(b + start[3] + 4 * i);
     const uint8_t *tn = b + start[2];
-    if (!trieOk(nodes, records, [tn](uint32_t n) {
-          const uint8_t *p = tn + 4 * n;
-          return NodeView{p[0] != 0, p[1], 0, 255, vl::rd16(p + 2)};
-        }))
-      return kBad;
+    uint32_t rc = trieCheck(nodes, records, [tn](uint32_t n) {
+      const uint8_t *p = tn + 4 * n;
+      return NodeView{p[0] != 0, p[1], 0, 255, vl::rd16(p + 2)};
+    });
+    if (rc) return rc;
   } else if (needTrie) {
     return kBad;
   }
@@ -183,11 +183,11 @@ uint32_t checkCodePage(VLObjEntry *e) {
     uint32_t values = (tsize - valueOff) / 2;
     for (uint32_t i = 0; i < nodes; ++i) swap16(t + cp::kNodeSize * i + 4);
     swap16Run(t + valueOff, values);
-    if (!trieOk(nodes, values, [t](uint32_t n) {
-          const uint8_t *p = t + cp::kNodeSize * n;
-          return NodeView{p[0] != 0, p[1], p[2], p[3], vl::rd16(p + 4)};
-        }))
-      return kBad;
+    uint32_t rc = trieCheck(nodes, values, [t](uint32_t n) {
+      const uint8_t *p = t + cp::kNodeSize * n;
+      return NodeView{p[0] != 0, p[1], p[2], p[3], vl::rd16(p + 4)};
+    });
+    if (rc) return rc;
   } else if (needTrie) {
     return kBad;
   }
