@@ -1,0 +1,55 @@
+// UTF-16 units to a byte string. A shift-sensitive page gets Shift-Out/Shift-In around
+// its double-byte runs and no terminator; any other page gets a terminating 0.
+#include "codepage/cpprim.h"
+
+VL_TRACE_MODULE("vlcpu2s");
+
+namespace {
+
+using namespace vl::cp;
+
+size_t unitCount(const VLUChar *u) {
+  size_t n = 0;
+  while (u[n]) ++n;
+  return n;
+}
+
+int32_t shifted(const VLCodePage *c, const VLUChar *u, size_t count, bool wide, uint8_t *out) {
+  const uint8_t so = shiftOut(c), si = shiftIn(c);
+  size_t pos = 0, soAt = SIZE_MAX;
+  for (size_t i = 0; i < count; ++i) {
+    uint8_t b[4];
+    int n = uniToMb(c, u[i], b);
+    if (n == 1 && wide) {
+      out[pos++] = si;
+      wide = false;
+    } else if (n > 1 && !wide) {
+      soAt = pos;
+      out[pos++] = so;
+      wide = true;
+    }
+    for (int k = 0; k < n; ++k) out[pos++] = b[k];
+  }
+  if (wide) {
+    // A Shift-Out with nothing behind it is dropped rather than closed.
+    if (pos > 0 && soAt == pos - 1)
+      --pos;
+    else
+      out[pos++] = si;
+  }
+  return static_cast<int32_t>(pos);
+}
+
+}  // namespace
+
+int32_t VLCpUnicodeToStr(const VLCodePage *cp, const VLUChar *u, int32_t length, VLShiftState state,
+                         unsigned char *out) {
+  VL_FLOW("VLCpUnicodeToStr");
+  if (!usable(cp) || !u || !out) VL_RET(int32_t{0});
+  size_t count = length < 0 ? unitCount(u) : static_cast<size_t>(length);
+  if (!isUtf8(cp) && isShift(cp)) VL_RET(shifted(cp, u, count, state != 0, out));
+  size_t pos = 0;
+  for (size_t i = 0; i < count && u[i]; ++i) pos += static_cast<size_t>(uniToMb(cp, u[i], out + pos));
+  out[pos] = 0;
+  VL_RET(static_cast<int32_t>(pos));
+}
