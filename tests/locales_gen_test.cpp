@@ -1,0 +1,320 @@
+// Languages and territories generated from the C library's locale sources.
+#include <gtest/gtest.h>
+#include <langinfo.h>
+#include <locale.h>
+#include <stdlib.h>
+
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <set>
+
+#include "locales.h"
+#include "locsrc_parse.h"
+#include "locsrc_pattern.h"
+
+namespace {
+
+using mkdefs::DefObject;
+namespace fs = std::filesystem;
+using mkdefs::locsrc::fromUtf8;
+using mkdefs::locsrc::toUtf8;
+
+const char *kSrc = "/usr/share/i18n/locales";
+
+struct NatRow {
+  const char *native, *language, *territory, *codePage, *sort;
+};
+const NatRow kNat[] = {
+#include "locale/nattab.inc"
+};
+
+const std::map<std::string, uint16_t> kCpIds = {
+    {"US-ASCII", 367}, {"Latin1", 819},     {"ISO-8859-2", 912}, {"ISO-8859-5", 915},
+    {"MS949", 1363},   {"MS950", 1370},     {"JapanEUC", 954},   {"UTF-8", 1208},
+};
+uint16_t cpId(const std::string &name) {
+  auto it = kCpIds.find(name);
+  return it == kCpIds.end() ? 0 : it->second;
+}
+
+uint16_t word(const DefObject &o, size_t w) {
+  const auto &b = o.sections.at(0);
+  return static_cast<uint16_t>(b.at(w * 2) << 8 | b.at(w * 2 + 1));
+}
+
+// The UTF-16 text whose offset word w holds; fails the test when it leaves the body.
+std::u32string text(const DefObject &o, size_t w) {
+  const auto &b = o.sections.at(0);
+  std::u32string s;
+  for (size_t at = word(o, w);; at += 2) {
+    EXPECT_LT(at + 1, b.size()) << o.name << " word " << w;
+    if (at + 1 >= b.size()) return s;
+    char32_t u = static_cast<char32_t>(b[at] << 8 | b[at + 1]);
+    if (u == 0) return s;
+    s += u;
+  }
+}
+std::string text8(const DefObject &o, size_t w) { return toUtf8(text(o, w)); }
+
+class Generated : public ::testing::Test {
+ protected:
+  static void SetUpTestSuite() {
+    if (!fs::exists(kSrc)) return;
+    objs_ = new std::vector<DefObject>;
+    ok_ = mkdefs::buildLanguagesAndTerritories(kSrc, cpId, objs_, &err_);
+  }
+  void SetUp() override {
+    if (objs_ == nullptr) GTEST_SKIP() << "no locale sources in " << kSrc;
+    ASSERT_TRUE(ok_) << err_;
+  }
+  static const DefObject &get(uint8_t type, const std::string &name) {
+    for (const auto &o : *objs_)
+      if (o.type == type && o.name == name) return o;
+    ADD_FAILURE() << "no object " << name;
+    static DefObject none;
+    none.sections.assign(1, mkdefs::Bytes(102, 0));
+    return none;
+  }
+  static inline std::vector<DefObject> *objs_ = nullptr;
+  static inline bool ok_ = false;
+  static inline std::string err_;
+};
+
+TEST_F(Generated, EveryLanguageAndTerritoryOnce) {
+  std::set<std::string> langs, terrs;
+  for (const NatRow &r : kNat) {
+    langs.insert(r.language);
+    terrs.insert(r.territory);
+  }
+  std::multiset<std::string> gotLangs, gotTerrs;
+  std::set<uint16_t> langIds, terrIds;
+  for (const auto &o : *objs_) {
+    (o.type == 0 ? gotLangs : gotTerrs).insert(o.name);
+    EXPECT_TRUE((o.type == 0 ? langIds : terrIds).insert(o.id).second) << o.name;
+    EXPECT_EQ(o.sections.size(), 1u);
+  }
+  EXPECT_EQ(gotLangs, std::multiset<std::string>(langs.begin(), langs.end()));
+  EXPECT_EQ(gotTerrs, std::multiset<std::string>(terrs.begin(), terrs.end()));
+  EXPECT_EQ(*langIds.begin(), 1);
+  EXPECT_EQ(*langIds.rbegin(), langs.size());
+  EXPECT_EQ(get(0, "English").id, 1);
+  EXPECT_EQ(get(1, "UnitedStates").id, 840);
+  EXPECT_EQ(get(1, "Germany").id, 276);
+  EXPECT_EQ(get(1, "Yugoslavia").id, 891);
+}
+
+TEST_F(Generated, EnglishAndUnitedStates) {
+  const DefObject &en = get(0, "English");
+  EXPECT_EQ(word(en, 0), 840);
+  EXPECT_EQ(word(en, 1), 367);
+  EXPECT_EQ(word(en, 2), 0);
+  const char *days[] = {"Sunday", "Monday", "Tuesday", "Wednesday", "Thursday", "Friday", "Saturday"};
+  const char *months[] = {"January", "February", "March",     "April",   "May",      "June",
+                          "July",    "August",   "September", "October", "November", "December"};
+  for (size_t i = 0; i < 7; ++i) {
+    EXPECT_EQ(text8(en, 7 + i), days[i]);
+    EXPECT_EQ(text8(en, 14 + i), std::string(days[i], 3));
+  }
+  for (size_t i = 0; i < 12; ++i) {
+    EXPECT_EQ(text8(en, 21 + i), months[i]);
+    EXPECT_EQ(text8(en, 34 + i), std::string(months[i], 3));
+  }
+  const std::pair<size_t, const char *> enTexts[] = {{5, "en"}, {6, "English"}, {33, ""}, {46, ""}, {47, "AM"}, {48, "PM"}};
+  for (const auto &[w, want] : enTexts) EXPECT_EQ(text8(en, w), want) << "word " << w;
+
+  const DefObject &us = get(1, "UnitedStates");
+  const std::pair<size_t, uint16_t> usWords[] = {{0, '.'}, {1, ','}, {3, '.'}, {4, ','}, {5, 2}, {6, 2},
+                                                 {7, 2},   {8, 0x0101}, {9, 840}, {10, 0x0A}};
+  for (const auto &[w, want] : usWords) EXPECT_EQ(word(us, w), want) << "word " << w;
+  const std::pair<size_t, const char *> usTexts[] = {
+      {11, "US"}, {12, "United States"}, {13, "3;3;0"}, {14, "3;3;0"}, {15, "$"}, {16, "USD"}, {17, ""},
+      {18, "-"},  {19, "%I:%M:%S %p"},   {20, "%m/%d/%Y"}, {21, "%A %B %#d %Y"}};
+  for (const auto &[w, want] : usTexts) EXPECT_EQ(text8(us, w), want) << "word " << w;
+}
+
+TEST_F(Generated, LanguageDefaultsAndTellingValues) {
+  struct Want {
+    const char *language;
+    uint16_t territory;
+    const char *codePage, *code;
+  };
+  const Want wants[] = {
+      {"German", 276, "Latin1", "de"},      {"Swedish", 752, "Latin1", "sv"},
+      {"Japanese", 392, "JapanEUC", "ja"},  {"Korean", 410, "MS949", "ko"},
+      {"TraditionalChinese", 158, "MS950", "zh"}, {"SerboCroatian", 891, "ISO-8859-2", "sh"},
+      {"Russian", 643, "ISO-8859-5", "ru"}, {"Arabic", 682, "ISO-8859-6", "ar"},
+  };
+  for (const Want &w : wants) {
+    const DefObject &o = get(0, w.language);
+    EXPECT_EQ(word(o, 0), w.territory) << w.language;
+    EXPECT_EQ(word(o, 1), cpId(w.codePage)) << w.language;  // 0 for names the fake does not know
+    EXPECT_EQ(text8(o, 5), w.code) << w.language;
+  }
+  EXPECT_EQ(text8(get(0, "German"), 7), "Sonntag");
+  EXPECT_EQ(text8(get(0, "German"), 23), "März");
+  EXPECT_EQ(word(get(1, "France"), 0), ',');
+  EXPECT_EQ(word(get(1, "Germany"), 1), '.');
+  for (size_t w = 21; w <= 32; ++w) EXPECT_FALSE(text(get(0, "Japanese"), w).empty());
+}
+
+// Every body keeps its texts inside, and every pattern is one the formatter can expand
+// from its 32-byte pattern buffer.
+TEST_F(Generated, BodiesAreWellFormed) {
+  for (const auto &o : *objs_) {
+    const auto &b = o.sections[0];
+    ASSERT_LE(b.size(), 65535u) << o.name;
+    if (o.type == 0) {
+      EXPECT_EQ(word(o, 3), 0) << o.name;
+      EXPECT_EQ(word(o, 4), 0) << o.name;
+      EXPECT_LE(word(o, 49), b.size());
+      EXPECT_LE(word(o, 50), b.size());
+      for (size_t w = 5; w <= 48; ++w) text(o, w);
+      EXPECT_TRUE(text(o, 33).empty() && text(o, 46).empty()) << o.name;
+      continue;
+    }
+    for (size_t w = 11; w <= 18; ++w) text(o, w);
+    for (size_t w : {13, 14}) {
+      std::string g = text8(o, w);
+      EXPECT_TRUE(g.find_first_not_of("0123456789;") == std::string::npos && !g.empty() && g.back() != ';')
+          << o.name << " " << g;
+    }
+    for (size_t w = 19; w <= 21; ++w) {
+      std::string p = text8(o, w);
+      EXPECT_LT(p.size(), 32u) << o.name << " " << p;
+      for (size_t i = 0; i < p.size(); ++i) {
+        if (p[i] != '%') continue;
+        size_t k = i + 1 < p.size() && p[i + 1] == '#' ? i + 2 : i + 1;
+        ASSERT_LT(k, p.size()) << o.name << " " << p;
+        EXPECT_NE(std::string("aAbBdHIjmMpSUwWyY%").find(p[k]), std::string::npos) << o.name << " " << p;
+        i = k;
+      }
+    }
+  }
+}
+
+// Compiles a few locales with the C library's own compiler and compares what it reports
+// with the generated objects: names, separators, currency, and the patterns (rewritten by
+// the same rules, so that this checks the reading of the sources).
+TEST_F(Generated, AgreesWithCompiledLocales) {
+  fs::path dir = fs::temp_directory_path() / ("vl_locgen_" + std::to_string(getpid()));
+  fs::create_directories(dir);
+  const char *sources[] = {"de_DE", "ja_JP", "zh_TW"};
+  for (const char *s : sources) {
+    std::string cmd = "localedef -i " + std::string(s) + " -f UTF-8 " + (dir / (std::string(s) + ".UTF-8")).string() +
+                      " >/dev/null 2>&1";
+    if (std::system(cmd.c_str()) == -1 || !fs::exists(dir / (std::string(s) + ".UTF-8") / "LC_TIME")) {
+      fs::remove_all(dir);
+      GTEST_SKIP() << "localedef unavailable";
+    }
+  }
+  const char *oldPath = getenv("LOCPATH");
+  std::string saved = oldPath ? oldPath : "";
+  setenv("LOCPATH", dir.c_str(), 1);
+  std::map<std::string, locale_t> loc;
+  for (const char *s : sources) loc[s] = newlocale(LC_ALL_MASK, (std::string(s) + ".UTF-8").c_str(), nullptr);
+  oldPath ? setenv("LOCPATH", saved.c_str(), 1) : unsetenv("LOCPATH");
+  fs::remove_all(dir);
+
+  auto info = [&](const std::string &s, nl_item item) { return fromUtf8(nl_langinfo_l(item, loc[s])); };
+  const std::pair<const char *, const char *> languages[] = {
+      {"German", "de_DE"}, {"Japanese", "ja_JP"}, {"TraditionalChinese", "zh_TW"}};
+  for (const auto &[name, s] : languages) {
+    ASSERT_NE(loc[s], nullptr) << s;
+    const DefObject &o = get(0, name);
+    for (int i = 0; i < 7; ++i) {
+      EXPECT_EQ(text(o, 7 + i), info(s, DAY_1 + i)) << name;
+      EXPECT_EQ(text(o, 14 + i), info(s, ABDAY_1 + i)) << name;
+    }
+    for (int i = 0; i < 12; ++i) {
+      EXPECT_EQ(text(o, 21 + i), info(s, MON_1 + i)) << name;
+      EXPECT_EQ(text(o, 34 + i), info(s, ABMON_1 + i)) << name;
+    }
+    EXPECT_EQ(text(o, 47), info(s, AM_STR)) << name;
+    EXPECT_EQ(text(o, 48), info(s, PM_STR)) << name;
+  }
+  const std::pair<const char *, const char *> territories[] = {
+      {"Germany", "de_DE"}, {"Japan", "ja_JP"}, {"Taiwan", "zh_TW"}};
+  for (const auto &[name, s] : territories) {
+    const DefObject &o = get(1, name);
+    mkdefs::locsrc::TimeFormats tf{info(s, D_FMT), info(s, T_FMT), info(s, D_T_FMT), info(s, T_FMT_AMPM),
+                                   info(s, _DATE_FMT)};
+    EXPECT_EQ(text(o, 19), mkdefs::locsrc::translatePattern(tf.tFmt, tf)) << name;
+    EXPECT_EQ(text(o, 20), mkdefs::locsrc::translatePattern(tf.dFmt, tf)) << name;
+    EXPECT_EQ(text(o, 21), mkdefs::locsrc::longDatePattern(tf)) << name;
+    EXPECT_EQ(std::u32string(1, word(o, 0)), info(s, RADIXCHAR)) << name;
+    EXPECT_EQ(text(o, 15), info(s, CURRENCY_SYMBOL)) << name;
+    EXPECT_EQ(text8(o, 16) + " ", toUtf8(info(s, INT_CURR_SYMBOL))) << name;
+    EXPECT_EQ(word(o, 6), *nl_langinfo_l(FRAC_DIGITS, loc[s])) << name;
+    EXPECT_EQ(word(o, 8) >> 8, *nl_langinfo_l(P_SIGN_POSN, loc[s])) << name;
+  }
+  for (auto &[s, l] : loc)
+    if (l) freelocale(l);
+}
+
+TEST(LocaleSource, ReaderFollowsTheFormat) {
+  fs::path dir = fs::temp_directory_path() / ("vl_locsrc_" + std::to_string(getpid()));
+  fs::create_directories(dir);
+  std::ofstream(dir / "top") << "comment_char %\nescape_char /\n"
+                                "% a comment \"with a quote\n"
+                                "LC_TIME\n"
+                                "abday \"a<U00E4>b\";\"x//y\" % trailing comment\n"
+                                "day \"Son/\nntag\";/\n    \"Mon\"\n"
+                                "t_fmt \"%H:%M\"\n"
+                                "END LC_TIME\n"
+                                "LC_NUMERIC\ncopy \"base\"\nEND LC_NUMERIC\n"
+                                "LC_MONETARY\ncopy \"missing\"\nEND LC_MONETARY\n";
+  std::ofstream(dir / "base") << "LC_NUMERIC\ndecimal_point \",\"\ngrouping 3;-1\nEND LC_NUMERIC\n";
+  mkdefs::locsrc::SourceSet set(dir.string());
+  std::string err;
+  auto strings = [&](const char *cat, const char *key) {
+    std::vector<std::string> out;
+    if (const auto *v = set.find("top", cat, key, &err))
+      for (const auto &val : *v) out.push_back(toUtf8(val.text));
+    return out;
+  };
+  EXPECT_EQ(strings("LC_TIME", "abday"), (std::vector<std::string>{"a\u00E4b", "x/y"}));
+  EXPECT_EQ(strings("LC_TIME", "day"), (std::vector<std::string>{"Sonntag", "Mon"}));
+  EXPECT_EQ(strings("LC_TIME", "t_fmt"), (std::vector<std::string>{"%H:%M"}));
+  EXPECT_EQ(strings("LC_NUMERIC", "decimal_point"), (std::vector<std::string>{","}));
+  EXPECT_EQ(strings("LC_NUMERIC", "grouping"), (std::vector<std::string>{"3", "-1"}));
+  EXPECT_TRUE(strings("LC_TIME", "mon").empty());
+  EXPECT_EQ(err, "");
+  EXPECT_TRUE(strings("LC_MONETARY", "frac_digits").empty());
+  EXPECT_NE(err, "");
+  err.clear();
+  EXPECT_EQ(set.find("../etc/passwd", "LC_TIME", "day", &err), nullptr);
+  EXPECT_NE(err, "");
+  fs::remove_all(dir);
+}
+
+TEST(LocaleSource, PatternsUseTheFormattersDirectives) {
+  mkdefs::locsrc::TimeFormats tf{U"%d.%m.%Y", U"%T", U"%a %x %X %Z", U"", U""};
+  const std::pair<const char32_t *, const char32_t *> cases[] = {
+      {U"%e.%-m.%y", U"%#d.%#m.%y"},
+      {U"%k:%M %P", U"%#H:%M %p"},
+      {U"%D %R", U"%m/%d/%y %H:%M"},
+      {U"%r", U"%I:%M:%S %p"},
+      {U"%c", U"%a %d.%m.%Y %H:%M:%S"},
+      {U"%a %d %b %Y %T %Z", U"%a %d %b %Y %H:%M:%S"},
+      {U"%d/%m/%Ey", U"%d/%m/%Y"},
+      {U"%EC %Ey", U"%Y"},
+      {U"%C%y %C", U"%Y"},
+      {U"%Od%h%%", U"%d%b%%"},
+      {U"100%", U"100%%"},
+  };
+  for (const auto &[src, want] : cases)
+    EXPECT_EQ(toUtf8(mkdefs::locsrc::translatePattern(src, tf)), toUtf8(want)) << toUtf8(src);
+
+  const std::pair<mkdefs::locsrc::TimeFormats, const char32_t *> longDates[] = {
+      {{U"%m/%d/%Y", U"%r", U"", U"%I:%M:%S %p", U"%a %b %e %r %Z %Y"}, U"%A %B %#d %Y"},
+      {{U"%d.%m.%Y", U"%T", U"%a %d %b %Y %T", U"", U""}, U"%A %d %B %Y"},
+      {{U"%Y-%m-%d", U"%T", U"", U"", U"%A, %d. %B %Y, %H:%M"}, U"%A, %d. %B %Y"},
+      {{U"%Y-%m-%d", U"%T", U"", U"", U"%Y\u5E74%m\u6708%d\u65E5%H\u6642"}, U"%Y\u5E74%m\u6708%d\u65E5"},
+      {{U"%d.%m.%Y", U"%T", U"%T", U"", U"%T"}, U"%d.%m.%Y"},
+  };
+  for (const auto &[fmts, want] : longDates)
+    EXPECT_EQ(toUtf8(mkdefs::locsrc::longDatePattern(fmts)), toUtf8(want)) << toUtf8(fmts.dateFmt);
+}
+
+}  // namespace
