@@ -295,14 +295,30 @@ bool buildTerritory(locsrc::SourceSet &set, const NativeRow &row, DefObject *obj
   return b.finish(obj->name, &obj->sections[0], err);
 }
 
-struct LanguagePlan {
-  const NativeRow *primary = nullptr;
-  std::string defaultCodePage;  // empty when every row is UTF-8
-};
+const NativeRow *primaryRow(const std::vector<const NativeRow *> &rows,
+                            const std::map<std::string, const NativeRow *> &territoryRow) {
+  for (const NativeRow *r : rows)
+    if (codesMatch(r->native)) return r;
+  for (const NativeRow *r : rows)
+    if (std::string(territoryRow.at(r->territory)->language) == r->language) return r;
+  return rows.front();
+}
 
-bool buildLanguage(locsrc::SourceSet &set, const std::string &name, const LanguagePlan &plan,
+// The code page of the first row that is not UTF-8, looked for among the primary's own
+// forms first; empty when the language has only UTF-8 rows.
+std::string defaultCodePage(const std::vector<const NativeRow *> &rows, const NativeRow &primary) {
+  for (bool samePrefix : {true, false}) {
+    for (const NativeRow *r : rows) {
+      if (std::string(r->codePage) != "UTF-8" && (!samePrefix || prefixOf(r->native) == prefixOf(primary.native)))
+        return r->codePage;
+    }
+  }
+  return {};
+}
+
+bool buildLanguage(locsrc::SourceSet &set, const std::string &name, const NativeRow &primary,
                    uint16_t territoryId, uint16_t codePageId, DefObject *obj, std::string *err) {
-  std::string src = sourceFor(plan.primary->native);
+  std::string src = sourceFor(primary.native);
   Fetch f(set, src, err);
   obj->type = 0;
   obj->name = name;
@@ -357,7 +373,7 @@ bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
     if (territoryRow.emplace(r.territory, &r).second) territories.push_back(r.territory);
   }
 
-  std::vector<DefObject> result;
+  std::vector<DefObject> territoryObjs;
   std::map<std::string, uint16_t> territoryIds;
   std::set<uint16_t> usedIds;
   for (const std::string &t : territories) {
@@ -368,50 +384,29 @@ bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
       return false;
     }
     territoryIds[t] = obj.id;
-    result.push_back(std::move(obj));
+    territoryObjs.push_back(std::move(obj));
   }
+  std::sort(territoryObjs.begin(), territoryObjs.end(),
+            [](const DefObject &a, const DefObject &b) { return a.id < b.id; });
 
   std::sort(languages.begin(), languages.end(), [](const std::string &a, const std::string &b) {
     return (a == "English") != (b == "English") ? a == "English" : a < b;
   });
-  std::vector<DefObject> langs;
+  std::vector<DefObject> objs;
   for (size_t i = 0; i < languages.size(); ++i) {
     const auto &rows = rowsOf[languages[i]];
-    LanguagePlan plan;
-    plan.primary = rows.front();
-    for (const NativeRow *r : rows) {
-      if (codesMatch(r->native)) {
-        plan.primary = r;
-        break;
-      }
-    }
-    if (!codesMatch(plan.primary->native)) {
-      for (const NativeRow *r : rows) {
-        if (territoryRow[r->territory]->language == languages[i]) {
-          plan.primary = r;
-          break;
-        }
-      }
-    }
-    std::string prefix = prefixOf(plan.primary->native);
-    for (bool samePrefix : {true, false}) {
-      for (const NativeRow *r : rows) {
-        if (plan.defaultCodePage.empty() && std::string(r->codePage) != "UTF-8" &&
-            (!samePrefix || prefixOf(r->native) == prefix))
-          plan.defaultCodePage = r->codePage;
-      }
-    }
-    uint16_t cp = plan.defaultCodePage.empty() ? 0 : codePageId(plan.defaultCodePage);
+    const NativeRow *primary = primaryRow(rows, territoryRow);
+    std::string cpName = defaultCodePage(rows, *primary);
     DefObject obj;
     obj.id = static_cast<uint16_t>(i + 1);
-    if (!buildLanguage(set, languages[i], plan, territoryIds[plan.primary->territory], cp, &obj, err))
+    if (!buildLanguage(set, languages[i], *primary, territoryIds[primary->territory],
+                       cpName.empty() ? 0 : codePageId(cpName), &obj, err))
       return false;
-    langs.push_back(std::move(obj));
+    objs.push_back(std::move(obj));
   }
-  langs.insert(langs.end(), std::make_move_iterator(result.begin()), std::make_move_iterator(result.end()));
-  std::stable_sort(langs.begin() + static_cast<long>(languages.size()), langs.end(),
-                   [](const DefObject &a, const DefObject &b) { return a.id < b.id; });
-  *out = std::move(langs);
+  objs.insert(objs.end(), std::make_move_iterator(territoryObjs.begin()),
+              std::make_move_iterator(territoryObjs.end()));
+  *out = std::move(objs);
   return true;
 }
 
