@@ -32,6 +32,7 @@ struct CpSource {
 // records are shared so that each section stays within 65,535 bytes.
 struct CpSections {
   std::vector<Bytes> sections;
+  std::string note;  // what was left out to make the object fit, if anything
 };
 
 bool buildCodePage(const CpSource &src, const UnicodeProps &ucd, CpSections *out, std::string *err);
