@@ -125,7 +125,7 @@ class Packer {
 };
 
 uint16_t index16(size_t p, const char *what) {
-  if (p > 0xFFFF) throw Failure(std::string(what) + " index beyond 65535");
+  if (p > 0xFFFF) throw Failure(std::string(what) + " beyond 65535");
   return static_cast<uint16_t>(p);
 }
 
@@ -175,7 +175,7 @@ class ConvTrie {
       put8(b, n.hi);
       put16(b, n.base);
     }
-    *valueOffset = index16(b.size(), "conversion value array");
+    *valueOffset = index16(b.size(), "section 1 (conversion trie): value array offset");
     for (size_t i = 0; i < values_.size(); ++i) put16(b, static_cast<uint16_t>(values_.at(i)));
     return b;
   }
@@ -195,7 +195,7 @@ class ConvTrie {
     if (allOneByte(seqs)) {
       for (unsigned b = lo; b <= hi; ++b) pat[b & mask] = kNoChar;
       for (const auto &[s, u] : seqs) pat[static_cast<uint8_t>(s[0]) & mask] = u;
-      return Node6{1, mask, lo, hi, index16(values_.place(pat), "conversion value")};
+      return Node6{1, mask, lo, hi, index16(values_.place(pat), "section 1 (conversion trie): value")};
     }
     for (unsigned b = lo; b <= hi; ++b) pat[b & mask] = keyOf(kEmptyLeaf);
     for (const auto &[b, rest] : byFirstByte(seqs)) {
@@ -203,7 +203,7 @@ class ConvTrie {
         throw Failure("byte sequence is both a character and the prefix of another");
       pat[b & mask] = keyOf(level(rest));
     }
-    return Node6{0, mask, lo, hi, index16(nodes_.place(pat), "conversion node")};
+    return Node6{0, mask, lo, hi, index16(nodes_.place(pat), "section 1 (conversion trie): node")};
   }
 
   Packer values_;
@@ -238,19 +238,13 @@ class TypeTrie {
     nodes_.push(kRootSlot);
   }
 
-  // seqs: every character that the trie answers for, single bytes included, by its bytes.
+  // seqs: every character of more than one byte, by its bytes. One-byte characters
+  // take their types from the fixed single-byte table.
   void build(const std::map<std::string, Record> &seqs) {
     recs_.push(0);  // the filler record sits at index 0
-    std::map<uint8_t, Key> slots;
-    for (const auto &[b, rest] : byFirstByte(withKeys(seqs))) {
-      if (rest.count("")) {
-        if (rest.size() != 1) throw Failure("byte sequence is both a character and the prefix of another");
-        slots[b] = nodeKey(Node4{1, 0, index16(recs_.place({rest.at("")}), "type record")});
-      } else {
-        slots[b] = nodeKey(level(rest));
-      }
-    }
-    Node4 root = inner(slots);
+    if (seqs.empty()) throw Failure("a type trie needs characters of more than one byte");
+    Node4 root = level(withKeys(seqs));
+    if (root.leaf) throw Failure("type trie root must consume the lead byte");
     nodes_.replace(0, nodeKey(root));
   }
 
@@ -328,7 +322,7 @@ class TypeTrie {
     for (const auto &[b, key] : slots) pat[b & mask] = key;
     const size_t at = into.place(pat);
     if (at != p) throw Failure("type trie placement changed between search and commit");
-    return Node4{leaf, mask, index16(at, leaf ? "type record" : "type node")};
+    return Node4{leaf, mask, index16(at, leaf ? "section 0 (body): type record" : "section 0 (body): type node")};
   }
 
   Node4 inner(const std::map<uint8_t, Key> &slots) { return fitted(nodes_, slots, kAnyLeaf, 0); }
@@ -402,7 +396,7 @@ void buildIndex(const std::map<uint16_t, uint32_t> &fromW, uint8_t subst, Bytes 
     size_t start = std::max(t.size(), width * lo);
     if (width == 2 && start % 2) ++start;
     t.resize(start + width * n, 0);
-    if (start - width * lo > 0xFFFF) throw Failure("index table offset beyond 65535");
+    if (start - width * lo > 0xFFFF) throw Failure("sections 2 and 3 (index tables): offset beyond 65535");
     return start;
   };
   for (size_t width : {2u, 1u})
@@ -588,7 +582,7 @@ void buildV2(const CpSource &src, const UnicodeProps &ucd, bool withTypeTrie, Cp
       if (h && w) pairs.emplace(packW(*h), packW(*w));
     }
     if (!pairs.empty()) {
-      set16(body, 6, index16(pairs.size(), "pair"));
+      set16(body, 6, index16(pairs.size(), "section 0 (body): pair"));
       set16(body, kPairOff, static_cast<uint16_t>(body.size()));
       for (const auto &[h, f] : pairs) {
         put32(body, h);
@@ -599,23 +593,19 @@ void buildV2(const CpSource &src, const UnicodeProps &ucd, bool withTypeTrie, Cp
     if (withTypeTrie) {
       std::map<std::string, Record> seqs;
       if (utf8) {
-        for (uint32_t u = 0; u < 0x10000; ++u) {
+        for (uint32_t u = 0x80; u < 0x10000; ++u) {
           if (u >= 0xD800 && u <= 0xDFFF) continue;
           const std::string s = utf8Of(u);
           seqs[s] = page.record(s, static_cast<uint16_t>(u));
         }
       } else {
         for (const auto &[s, u] : page.multi) seqs[s] = page.record(s, u);
-        // Single bytes answer for themselves too, where no multi-byte character starts.
-        if (!src.shift)
-          for (int b = 0; b < 256; ++b)
-            if (page.single[b]) seqs[std::string(1, static_cast<char>(b))] = page.record(std::string(1, static_cast<char>(b)), *page.single[b]);
       }
       TypeTrie types;
       types.build(seqs);
-      set16(body, kTypeTrieOff, index16(body.size(), "type trie offset"));
+      set16(body, kTypeTrieOff, index16(body.size(), "section 0 (body): type trie offset"));
       types.write(body);
-      set16(body, kTypeRecOff, index16(body.size(), "type record offset"));
+      set16(body, kTypeRecOff, index16(body.size(), "section 0 (body): type record offset"));
       types.writeRecords(body);
     }
   }
@@ -633,11 +623,19 @@ bool buildCodePage(const CpSource &src, const UnicodeProps &ucd, CpSections *out
   }
   try {
     CpSections built;
-    buildV2(src, ucd, true, &built);
-    if (src.id == kUtf8 && built.sections[0].size() > kMaxSection) {
-      const size_t full = built.sections[0].size();
+    // UTF-8 converts by arithmetic; its type trie is a bonus that is dropped if it cannot fit.
+    std::string whyNot;
+    try {
+      buildV2(src, ucd, true, &built);
+      if (built.sections[0].size() > kMaxSection)
+        whyNot = "the body would need " + std::to_string(built.sections[0].size()) + " bytes";
+    } catch (const Failure &f) {
+      if (src.id != kUtf8) throw;
+      whyNot = f.what();
+    }
+    if (src.id == kUtf8 && !whyNot.empty()) {
       buildV2(src, ucd, false, &built);
-      built.note = "type trie left out: the body would need " + std::to_string(full) + " bytes";
+      built.note = "type trie left out: " + whyNot;
     }
     for (size_t i = 0; i < built.sections.size(); ++i)
       if (built.sections[i].size() > kMaxSection) {

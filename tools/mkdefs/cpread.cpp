@@ -93,16 +93,14 @@ CpReader::Type CpReader::type(const std::string &bytes) const {
   const Bytes &b = section(cp_, 0);
   const size_t nodes = body16(kTypeTrieOff), recs = body16(kTypeRecOff);
   if (!nodes || !recs) throw std::runtime_error("no type trie");
-  // A leaf under a single byte reads whatever follows the character: 0 here.
   size_t node = 0;
-  for (size_t i = 0; i < 5; ++i) {
-    const uint8_t c = i < bytes.size() ? static_cast<uint8_t>(bytes[i]) : 0;
+  for (unsigned char c : bytes) {
     const uint8_t leaf = at8(b, nodes + 4 * node), mask = at8(b, nodes + 4 * node + 1);
     const size_t at = at16(b, nodes + 4 * node + 2) + (c & mask);
     if (leaf) return Type{at32(b, recs + 8 * at), static_cast<int32_t>(at32(b, recs + 8 * at + 4))};
     node = at;
   }
-  throw std::runtime_error("type trie deeper than any character");
+  throw std::runtime_error("type trie deeper than the character");
 }
 
 uint32_t CpReader::fullWidthOfByte(uint8_t b) const {

@@ -256,7 +256,7 @@ bool extractCodePage(const PageSpec &spec, Extracted *out, std::string *err) {
 bool buildFitted(Extracted *x, const UnicodeProps &ucd, CpSections *out, std::string *err) {
   for (;;) {
     if (buildCodePage(x->src, ucd, out, err)) return true;
-    if (err->find("more than 65535") == std::string::npos) return false;
+    if (err->find("65535") == std::string::npos) return false;
     std::map<std::string, size_t> groups;
     for (const auto &[s, u] : x->src.toUni)
       if (s.size() >= 3) ++groups[s.substr(0, s.size() - 2)];
