@@ -71,28 +71,28 @@ struct Tally {
 };
 
 TEST_F(Generated, EveryCodePageMatchesIconv) {
-  for (const PageSpec &spec : codePageSpecs()) {
-    SCOPED_TRACE(spec.name);
+  for (const CodePageDef &def : codeCodePageDefs()) {
+    SCOPED_TRACE(def.name);
     Extracted iconvView, built;
     std::string err;
-    ASSERT_TRUE(extractCodePage(spec, &iconvView, &err)) << err;
+    ASSERT_TRUE(extractCodePage(def, &iconvView, &err)) << err;
     built = iconvView;
     CpSections sections;
     ASSERT_TRUE(buildFitted(&built, ucd(), &sections, &err)) << err;
     // Only EUC-TW holds more than one section can: its sparse upper planes are left out.
-    EXPECT_EQ(built.droppedGroups.empty(), spec.id != 964);
+    EXPECT_EQ(built.droppedGroups.empty(), def.id != 964);
 
     // The directory holds exactly this object: generation is repeatable.
     Bytes file;
     ASSERT_TRUE(containerFile(sections.sections, 2, &file, &err));
-    std::ifstream in(std::string(VL_TEST_DEFS_DIR) + "/" + objectFileName(2, spec.id), std::ios::binary);
+    std::ifstream in(std::string(VL_TEST_DEFS_DIR) + "/" + objectFileName(2, def.id), std::ios::binary);
     EXPECT_TRUE(Bytes(std::istreambuf_iterator<char>(in), {}) == file);
 
     uint32_t rc = 0;
-    const VLCodePage *cp = VLGetObjFromID(manager(), VL_OBJ_CODEPAGE, spec.id, 0, &rc);
+    const VLCodePage *cp = VLGetObjFromID(manager(), VL_OBJ_CODEPAGE, def.id, 0, &rc);
     ASSERT_TRUE(cp) << rc;
     const CpSource &s = iconvView.src;
-    const bool utf8 = spec.id == VL_CP_UTF8;
+    const bool utf8 = def.id == VL_CP_UTF8;
     const bool typeTrie = vl::cp::off(cp, vl::cp::kTypeTrieOff) != 0;
     auto dropped = [&](const std::string &bytes) {
       for (const std::string &g : built.droppedGroups)
@@ -187,17 +187,17 @@ TEST_F(Generated, FamilyConventions) {
 }
 
 TEST_F(Generated, NamesAndAliases) {
-  for (const PageSpec &spec : codePageSpecs()) {
+  for (const CodePageDef &def : codeCodePageDefs()) {
     uint32_t rc = 0;
-    const VLObjEntry *e = VLGetObjFromName(manager(), VL_OBJ_CODEPAGE, spec.name.c_str(),
-                                           static_cast<int32_t>(spec.name.size()), 1, &rc);
-    ASSERT_TRUE(e) << spec.name;
-    EXPECT_EQ(e->id, spec.id);
-    for (const std::string &alias : spec.aliases) {
+    const VLObjEntry *e = VLGetObjFromName(manager(), VL_OBJ_CODEPAGE, def.name.c_str(),
+                                           static_cast<int32_t>(def.name.size()), 1, &rc);
+    ASSERT_TRUE(e) << def.name;
+    EXPECT_EQ(e->id, def.id);
+    for (const std::string &alias : def.aliases) {
       std::string lower = alias;
       for (char &c : lower) c = static_cast<char>(std::tolower(static_cast<unsigned char>(c)));
       const char *name = VLGetCodepageFromAlias(manager(), lower.c_str());
-      EXPECT_STREQ(name, spec.name.c_str()) << alias;
+      EXPECT_STREQ(name, def.name.c_str()) << alias;
     }
   }
 }

@@ -10,8 +10,8 @@
 
 namespace mkdefs {
 
-const std::vector<PageSpec> &codePageSpecs() {
-  static const std::vector<PageSpec> kSpecs = {
+const std::vector<CodePageDef> &codeCodePageDefs() {
+  static const std::vector<CodePageDef> kPages = {
       {367, "US-ASCII", "ANSI_X3.4-1968", false, false,
        {"ASCII", "ANSI_X3.4-1968", "ISO646-US", "CP367", "IBM367", "IBM-367", "367", "US"}},
       {819, "Latin1", "ISO-8859-1", false, false,
@@ -65,7 +65,7 @@ const std::vector<PageSpec> &codePageSpecs() {
       {935, "IBM935", "IBM935", true, true, {"CP935", "IBM-935", "935"}},
       {937, "IBM937", "IBM937", true, true, {"CP937", "IBM-937", "937"}},
   };
-  return kSpecs;
+  return kPages;
 }
 
 namespace {
@@ -148,29 +148,29 @@ struct Walker {
 
 }  // namespace
 
-bool extractCodePage(const PageSpec &spec, Extracted *out, std::string *err) {
+bool extractCodePage(const CodePageDef &def, Extracted *out, std::string *err) {
   Extracted x;
   CpSource &src = x.src;
-  src.id = spec.id;
-  src.name = spec.name;
-  src.ascii = !spec.ebcdic;
-  src.shift = spec.shift;
-  if (spec.ebcdic) {
+  src.id = def.id;
+  src.name = def.name;
+  src.ascii = !def.ebcdic;
+  src.shift = def.shift;
+  if (def.ebcdic) {
     // EBCDIC: SUB is 0x3F, line feed 0x25, and NL (0x15) ends lines on the host side.
     src.subst = 0x3F;
     src.lf = 0x25;
     src.cr = 0x0D;
     src.ls = src.ps = 0x15;
   }
-  Iconv dec("UCS-4LE", spec.iconvName), enc(spec.iconvName, "UCS-4LE");
+  Iconv dec("UCS-4LE", def.iconvName), enc(def.iconvName, "UCS-4LE");
   if (!dec.ok() || !enc.ok()) {
-    *err = spec.name + ": iconv does not know " + spec.iconvName;
+    *err = def.name + ": iconv does not know " + def.iconvName;
     return false;
   }
-  const bool utf8 = spec.id == kUtf8;
+  const bool utf8 = def.id == kUtf8;
 
   std::map<std::string, uint16_t> singles, multis;
-  if (spec.shift) {
+  if (def.shift) {
     Walker sb{dec, "", 1, x, {}};
     sb.walk("");
     singles = sb.found;
@@ -179,7 +179,7 @@ bool extractCodePage(const PageSpec &spec, Extracted *out, std::string *err) {
     multis = db.found;
     for (const auto &[s, u] : multis)
       if (s.size() != 2) {
-        *err = spec.name + ": a double-byte run holds a character of " + std::to_string(s.size()) + " bytes";
+        *err = def.name + ": a double-byte run holds a character of " + std::to_string(s.size()) + " bytes";
         return false;
       }
     src.maxLen = 2;
@@ -220,7 +220,7 @@ bool extractCodePage(const PageSpec &spec, Extracted *out, std::string *err) {
     std::memcpy(in.data(), &u, 4);
     if (enc.run(in, &bytes) != Iconv::kDone || bytes.empty()) continue;
     const uint16_t unit = static_cast<uint16_t>(u);
-    if (spec.shift) {
+    if (def.shift) {
       const bool dbcs = bytes.size() == 4 && static_cast<uint8_t>(bytes[0]) == src.so &&
                         static_cast<uint8_t>(bytes[3]) == src.si;
       const bool sbcs = bytes.size() == 1 && static_cast<uint8_t>(bytes[0]) != src.so &&
@@ -247,7 +247,7 @@ bool extractCodePage(const PageSpec &spec, Extracted *out, std::string *err) {
   };
   expect(src.lf, 0x0A, "line feed");
   expect(src.cr, 0x0D, "carriage return");
-  if (spec.ebcdic) expect(src.ls, 0x85, "new line");
+  if (def.ebcdic) expect(src.ls, 0x85, "new line");
   expect(src.subst, 0x1A, "substitution");
   *out = std::move(x);
   return true;

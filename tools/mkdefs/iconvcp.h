@@ -9,7 +9,7 @@
 
 namespace mkdefs {
 
-struct PageSpec {
+struct CodePageDef {
   uint16_t id;                       // registered code page number
   std::string name;                  // object name, as the native locale table writes it
   std::string iconvName;             // the C library's name for it
@@ -18,7 +18,7 @@ struct PageSpec {
   std::vector<std::string> aliases;  // other names, for alias.txt
 };
 
-const std::vector<PageSpec> &codePageSpecs();
+const std::vector<CodePageDef> &codeCodePageDefs();
 
 struct Extracted {
   CpSource src;
@@ -34,7 +34,7 @@ struct Extracted {
   std::vector<std::string> notes;
 };
 
-bool extractCodePage(const PageSpec &spec, Extracted *out, std::string *err);
+bool extractCodePage(const CodePageDef &def, Extracted *out, std::string *err);
 
 // Builds the object; when a section overflows, leaves out the least populated group of
 // sequences of three or more bytes, again and again, until it fits.

@@ -86,7 +86,7 @@ std::vector<std::string> selfCheck(const CpSource &src, const CpSections &cp, co
   return bad;
 }
 
-void reportPage(std::ostream &rep, const PageSpec &spec, const Extracted &x, const CpSections &cp,
+void reportPage(std::ostream &rep, const CodePageDef &def, const Extracted &x, const CpSections &cp,
                 const std::vector<std::string> &bad) {
   const CpSource &s = x.src;
   size_t singles = 0, multis = 0, roundTrips = 0;
@@ -108,7 +108,7 @@ void reportPage(std::ostream &rep, const PageSpec &spec, const Extracted &x, con
     else if (t->second != u)
       encodeOnly.push_back(unit(u) + " -> " + hex(bytes) + " (" + hex(bytes) + " -> " + unit(t->second) + ")");
   }
-  rep << "== " << spec.name << " (code page " << spec.id << ", iconv " << spec.iconvName << ")\n";
+  rep << "== " << def.name << " (code page " << def.id << ", iconv " << def.iconvName << ")\n";
   rep << "characters: " << singles << " single-byte, " << multis << " longer; units encoded: " << s.fromUni.size()
       << "; round trips: " << roundTrips << "\n";
   rep << "sections: body " << cp.sections[0].size() << ", conversion trie " << cp.sections[1].size() << ", low table "
@@ -144,8 +144,8 @@ bool aliasFile(const std::string &path, std::string *err) {
   a << "# Code page aliases. A line starting in column 1 names a code page as the control\n"
        "# file does, followed by other names for it; an indented line adds more names.\n";
   std::set<std::string> taken;
-  for (const PageSpec &p : codePageSpecs()) taken.insert(upper(p.name));
-  for (const PageSpec &p : codePageSpecs()) {
+  for (const CodePageDef &p : codeCodePageDefs()) taken.insert(upper(p.name));
+  for (const CodePageDef &p : codeCodePageDefs()) {
     a << p.name;
     for (const std::string &al : p.aliases) {
       if (al.size() > 64 || !taken.insert(upper(al)).second) {
@@ -196,22 +196,22 @@ int main(int argc, char **argv) {
          "character encodes to other bytes; a one-way encode is a unit whose bytes decode to\n"
          "another character (or none). The objects reproduce both directions as iconv has them.\n\n";
   size_t totalBad = 0;
-  for (const PageSpec &spec : codePageSpecs()) {
+  for (const CodePageDef &def : codeCodePageDefs()) {
     Extracted x;
     CpSections cp;
     Bytes file;
-    if (!extractCodePage(spec, &x, &err) || !buildFitted(&x, ucd, &cp, &err) ||
+    if (!extractCodePage(def, &x, &err) || !buildFitted(&x, ucd, &cp, &err) ||
         !containerFile(cp.sections, 2, &file, &err) ||
-        !writeFile(outDir + "/" + objectFileName(2, spec.id), file, &err))
+        !writeFile(outDir + "/" + objectFileName(2, def.id), file, &err))
       return fail(err);
     const std::vector<std::string> bad = selfCheck(x.src, cp, ucd);
     totalBad += bad.size();
-    reportPage(rep, spec, x, cp, bad);
-    rows.push_back(ControlRow{spec.id, 2, spec.name});
+    reportPage(rep, def, x, cp, bad);
+    rows.push_back(ControlRow{def.id, 2, def.name});
   }
 
   auto codePageId = [](const std::string &name) -> uint16_t {
-    for (const PageSpec &p : codePageSpecs()) {
+    for (const CodePageDef &p : codeCodePageDefs()) {
       if (upper(p.name) == upper(name)) return p.id;
       for (const std::string &a : p.aliases)
         if (upper(a) == upper(name)) return p.id;
