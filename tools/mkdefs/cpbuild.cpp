@@ -248,9 +248,6 @@ class TypeTrie {
     nodes_.replace(0, nodeKey(root));
   }
 
-  size_t nodeBytes() const { return nodes_.size() * 4; }
-  size_t recordBytes() const { return recs_.size() * 8; }
-
   void write(Bytes &b) const {
     for (size_t i = 0; i < nodes_.size(); ++i) {
       const Node4 &n = nodeList_[static_cast<size_t>(nodes_.at(i))];
