@@ -1,0 +1,733 @@
+// Shared machinery of the conversion family: one conversion loop, instantiated over a
+// source reader and a target writer.
+//
+// A reader frames characters (one byte, by lead-byte length, by shift state, UTF-16
+// units, W values) and hands each to a decoder (to UTF-16, or to its W value). A writer
+// takes the value through an encoder (from UTF-16 to bytes, to W, or W to bytes) and
+// frames the result (plain, with Shift-Out/Shift-In, units, W values). Every member of
+// the family, the streaming engine included, is `pump` over one such pair.
+#pragma once
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+
+#include "codepage/cpprim.h"
+
+namespace vl::cnv {
+
+using Value = uint32_t;
+constexpr size_t kNoLimit = SIZE_MAX / 8;
+
+enum class Got { Char, End, Partial };
+enum class Stop { Done, Partial, Full };
+
+// ---- Decoders: the bytes of one character to a value ---------------------------------
+
+// One-byte characters through the single-byte table; longer ones through the trie.
+struct TrieUni {
+  const VLCodePage *cp;
+  const uint8_t *sb;
+  explicit TrieUni(const VLCodePage *c) : cp(c), sb(cp::body(c) + cp::kSbcsUni) {}
+  Value one(uint8_t b) const { return rd16(sb + 2u * b); }
+  Value multi(const uint8_t *p, unsigned n) const { return cp::trieToUni(cp, p, n); }
+};
+
+// UTF-8 by arithmetic; one-byte characters still through the table.
+struct Utf8Uni {
+  const uint8_t *sb;
+  explicit Utf8Uni(const VLCodePage *c) : sb(cp::body(c) + cp::kSbcsUni) {}
+  Value one(uint8_t b) const { return rd16(sb + 2u * b); }
+  Value multi(const uint8_t *p, unsigned) const { return cp::utf8ToUni(p); }
+};
+
+// The character's own W value.
+struct RawW {
+  explicit RawW(const VLCodePage *) {}
+  Value one(uint8_t b) const { return b; }
+  Value multi(const uint8_t *p, unsigned n) const { return cp::readW(p, n); }
+};
+
+// ---- Readers ------------------------------------------------------------------------
+// safe(): characters that fast() may take without any bounds test.
+// fast(): takes one character, or refuses (a shift byte) leaving the work to get().
+// get(): takes one character with every test; Partial leaves it unread.
+// need()/decode(): complete a character held across calls of the streaming engine.
+
+template <class D>
+struct SbReader {
+  const uint8_t *p, *end;
+  D d;
+  uint8_t state = 0;
+  SbReader(const VLCodePage *c, const uint8_t *s, size_t n, uint8_t = 0) : p(s), end(s + n), d(c) {}
+  size_t safe() const { return static_cast<size_t>(end - p); }
+  bool fast(Value &v) {
+    v = d.one(*p++);
+    return true;
+  }
+  Got get(Value &v) {
+    if (p == end) return Got::End;
+    v = d.one(*p++);
+    return Got::Char;
+  }
+  unsigned need(uint8_t) const { return 1; }
+  Value decode(const uint8_t *q, unsigned) const { return d.one(q[0]); }
+};
+
+// Length from the lead byte: the code page's table, or UTF-8 arithmetic.
+struct TableLen {
+  const uint8_t *t;
+  explicit TableLen(const VLCodePage *c) : t(cp::body(c) + cp::kLenTable) {}
+  unsigned operator()(uint8_t b) const { return t[b]; }
+};
+struct Utf8Len {
+  explicit Utf8Len(const VLCodePage *) {}
+  unsigned operator()(uint8_t b) const { return cp::utf8Len(b); }
+};
+
+template <class L, class D>
+struct MbReader {
+  const uint8_t *p, *end;
+  L len;
+  D d;
+  uint8_t state = 0;
+  MbReader(const VLCodePage *c, const uint8_t *s, size_t n, uint8_t = 0) : p(s), end(s + n), len(c), d(c) {}
+  size_t safe() const { return static_cast<size_t>(end - p) / 4; }
+  Value take(unsigned n) {
+    Value v = n == 1 ? d.one(*p) : d.multi(p, n);
+    p += n;
+    return v;
+  }
+  bool fast(Value &v) {
+    v = take(len(*p));
+    return true;
+  }
+  Got get(Value &v) {
+    if (p == end) return Got::End;
+    unsigned n = len(*p);
+    if (n > static_cast<size_t>(end - p)) return Got::Partial;
+    v = take(n);
+    return Got::Char;
+  }
+  unsigned need(uint8_t lead) const { return len(lead); }
+  Value decode(const uint8_t *q, unsigned n) const { return n == 1 ? d.one(q[0]) : d.multi(q, n); }
+};
+
+// Shift-Out/Shift-In runs: maximum-length characters in state 1, single bytes in state 0.
+template <class D>
+struct ShiftReader {
+  const uint8_t *p, *end;
+  D d;
+  uint8_t state;
+  uint8_t so, si;
+  unsigned wide;
+  ShiftReader(const VLCodePage *c, const uint8_t *s, size_t n, uint8_t st)
+      : p(s), end(s + n), d(c), state(st ? 1 : 0), so(cp::shiftOut(c)), si(cp::shiftIn(c)), wide(cp::maxLen(c)) {}
+  size_t safe() const { return static_cast<size_t>(end - p) / wide; }
+  bool fast(Value &v) {
+    uint8_t b = *p;
+    if (b == so || b == si) return false;
+    if (state) {
+      v = d.multi(p, wide);
+      p += wide;
+    } else {
+      v = d.one(b);
+      ++p;
+    }
+    return true;
+  }
+  Got get(Value &v) {
+    for (;;) {
+      if (p == end) return Got::End;
+      if (*p == so)
+        state = 1;
+      else if (*p == si)
+        state = 0;
+      else
+        break;
+      ++p;
+    }
+    unsigned n = state ? wide : 1;
+    if (n > static_cast<size_t>(end - p)) return Got::Partial;
+    v = n == 1 ? d.one(*p) : d.multi(p, n);
+    p += n;
+    return Got::Char;
+  }
+  unsigned need(uint8_t) const { return state ? wide : 1; }
+  Value decode(const uint8_t *q, unsigned n) const { return n == 1 ? d.one(q[0]) : d.multi(q, n); }
+};
+
+struct U16Reader {
+  const VLUChar *p, *end;
+  uint8_t state = 0;
+  U16Reader(const VLUChar *s, size_t n) : p(s), end(s + n) {}
+  size_t safe() const { return static_cast<size_t>(end - p); }
+  bool fast(Value &v) {
+    v = *p++;
+    return true;
+  }
+  Got get(Value &v) {
+    if (p == end) return Got::End;
+    v = *p++;
+    return Got::Char;
+  }
+};
+
+// W values, to UTF-16 (one-byte values through the single-byte table) or as they are.
+struct WUni {
+  const VLCodePage *cp;
+  const uint8_t *sb;
+  explicit WUni(const VLCodePage *c) : cp(c), sb(cp::body(c) + cp::kSbcsUni) {}
+  Value operator()(VLWChar w) const { return w > 0xFF ? cp::wToUni(cp, w) : rd16(sb + 2u * w); }
+};
+struct WSame {
+  explicit WSame(const VLCodePage *) {}
+  Value operator()(VLWChar w) const { return w; }
+};
+
+template <class D>
+struct WReader {
+  const VLWChar *p, *end;
+  D d;
+  uint8_t state = 0;
+  WReader(const VLCodePage *c, const VLWChar *s, size_t n) : p(s), end(s + n), d(c) {}
+  size_t safe() const { return static_cast<size_t>(end - p); }
+  bool fast(Value &v) {
+    v = d(*p++);
+    return true;
+  }
+  Got get(Value &v) {
+    if (p == end) return Got::End;
+    v = d(*p++);
+    return Got::Char;
+  }
+};
+
+// ---- Encoders: a value to the bytes of one character ---------------------------------
+// kMax: the most bytes one value gives.
+
+// Single-byte target: the index entry of the last high byte is kept with its bounds, so a
+// run in one block of 256 units is a compare and a byte load per unit.
+struct SbEnc {
+  static constexpr unsigned kMax = 4;
+  const VLCodePage *cp;
+  const uint8_t *index, *low;
+  const uint8_t *entry = nullptr;
+  const uint8_t *tab = nullptr;
+  unsigned high = 0x100, lo = 1, hi = 0, mask = 0;
+  bool byte = false;
+  uint8_t sub;
+  explicit SbEnc(const VLCodePage *c)
+      : cp(c), index(cp::body(c) + cp::kIndex), low(cp::lowTable(c)), sub(cp::subst(c)) {}
+  void load(unsigned h) {
+    high = h;
+    entry = index + cp::kIndexSize * h;
+    lo = entry[2];
+    hi = entry[3];
+    mask = entry[1];
+    byte = entry[0] == 0;
+    tab = low ? low + rd16(entry + 4) : nullptr;
+    if (!tab) lo = 1, hi = 0;
+  }
+  unsigned operator()(Value u, uint8_t *out) {
+    unsigned h = (u >> 8) & 0xFF, l = u & 0xFF;
+    if (h != high) load(h);
+    if (l < lo || l > hi) {
+      out[0] = sub;
+      return 1;
+    }
+    if (byte) {
+      out[0] = tab[l & mask];
+      return 1;
+    }
+    return static_cast<unsigned>(cp::wToMb(out, cp::indexValue(cp, entry, static_cast<VLUChar>(u))));
+  }
+};
+
+struct MbEnc {
+  static constexpr unsigned kMax = 4;
+  const VLCodePage *cp;
+  explicit MbEnc(const VLCodePage *c) : cp(c) {}
+  unsigned operator()(Value u, uint8_t *out) const {
+    return static_cast<unsigned>(cp::uniToMb(cp, static_cast<VLUChar>(u), out));
+  }
+};
+
+struct Utf8Enc {
+  static constexpr unsigned kMax = 3;
+  explicit Utf8Enc(const VLCodePage *) {}
+  unsigned operator()(Value u, uint8_t *out) const {
+    if (u < 0x80) {
+      out[0] = static_cast<uint8_t>(u);
+      return 1;
+    }
+    return static_cast<unsigned>(cp::uniToUtf8(static_cast<VLUChar>(u), out));
+  }
+};
+
+// W values written as their bytes; a single-byte page takes the low byte of each.
+struct RawEnc {
+  static constexpr unsigned kMax = 4;
+  explicit RawEnc(const VLCodePage *) {}
+  unsigned operator()(Value w, uint8_t *out) const { return static_cast<unsigned>(cp::wToMb(out, w)); }
+};
+struct RawSbEnc {
+  static constexpr unsigned kMax = 1;
+  explicit RawSbEnc(const VLCodePage *) {}
+  unsigned operator()(Value w, uint8_t *out) const {
+    out[0] = static_cast<uint8_t>(w);
+    return 1;
+  }
+};
+
+// ---- Writers --------------------------------------------------------------------------
+// safe(): values that fast() may write without a room test. put(): writes one value only
+// if it fits whole. spill(): encodes one value (shift byte included) into buf for the
+// streaming engine, committing the shift state.
+
+template <class E>
+struct ByteWriter {
+  uint8_t *start, *o, *end;
+  E enc;
+  uint8_t state = 0;
+  ByteWriter(const VLCodePage *c, uint8_t *s, size_t n, uint8_t = 0) : start(s), o(s), end(s + n), enc(c) {}
+  size_t safe() const { return static_cast<size_t>(end - o) / E::kMax; }
+  void fast(Value v) { o += enc(v, o); }
+  bool put(Value v) {
+    uint8_t b[8];
+    unsigned n = enc(v, b);
+    if (n > static_cast<size_t>(end - o)) return false;
+    std::memcpy(o, b, n);
+    o += n;
+    return true;
+  }
+  unsigned spill(Value v, uint8_t *buf) { return enc(v, buf); }
+};
+
+template <class E>
+struct ShiftWriter {
+  uint8_t *start, *o, *end;
+  E enc;
+  uint8_t state;
+  uint8_t so, si;
+  ShiftWriter(const VLCodePage *c, uint8_t *s, size_t n, uint8_t st)
+      : start(s), o(s), end(s + n), enc(c), state(st ? 1 : 0), so(cp::shiftOut(c)), si(cp::shiftIn(c)) {}
+  size_t safe() const { return static_cast<size_t>(end - o) / (E::kMax + 1); }
+  // The character's bytes behind the shift byte it needs, if any.
+  unsigned form(Value v, uint8_t *b) {
+    unsigned n = enc(v, b + 1);
+    uint8_t want = n > 1 ? 1 : 0;
+    if (want == state) return n;
+    b[0] = want ? so : si;
+    return n + 1 + 0x100;  // the 0x100 marks a state change
+  }
+  void fast(Value v) {
+    uint8_t b[8];
+    unsigned n = form(v, b);
+    if (n & 0x100) {
+      state ^= 1;
+      n &= 0xFF;
+      std::memcpy(o, b, n);
+    } else {
+      std::memcpy(o, b + 1, n);
+    }
+    o += n;
+  }
+  bool put(Value v) {
+    uint8_t b[8];
+    unsigned n = form(v, b);
+    bool change = (n & 0x100) != 0;
+    n &= 0xFF;
+    if (n > static_cast<size_t>(end - o)) return false;
+    std::memcpy(o, change ? b : b + 1, n);
+    o += n;
+    if (change) state ^= 1;
+    return true;
+  }
+  unsigned spill(Value v, uint8_t *buf) {
+    uint8_t b[8];
+    unsigned n = form(v, b);
+    bool change = (n & 0x100) != 0;
+    n &= 0xFF;
+    std::memcpy(buf, change ? b : b + 1, n);
+    if (change) state ^= 1;
+    return n;
+  }
+};
+
+struct U16Writer {
+  VLUChar *start, *o, *end;
+  uint8_t state = 0;
+  U16Writer(VLUChar *s, size_t n) : start(s), o(s), end(s + n) {}
+  size_t safe() const { return static_cast<size_t>(end - o); }
+  void fast(Value v) { *o++ = static_cast<VLUChar>(v); }
+  bool put(Value v) {
+    if (o == end) return false;
+    *o++ = static_cast<VLUChar>(v);
+    return true;
+  }
+};
+
+// UTF-16 units to W values of the code page, or W values as they are.
+struct UniW {
+  const VLCodePage *cp;
+  explicit UniW(const VLCodePage *c) : cp(c) {}
+  VLWChar operator()(Value u) const { return cp::uniToW(cp, static_cast<VLUChar>(u)); }
+};
+struct SameW {
+  explicit SameW(const VLCodePage *) {}
+  VLWChar operator()(Value w) const { return w; }
+};
+
+template <class E>
+struct WWriter {
+  VLWChar *start, *o, *end;
+  E enc;
+  uint8_t state = 0;
+  WWriter(const VLCodePage *c, VLWChar *s, size_t n) : start(s), o(s), end(s + n), enc(c) {}
+  size_t safe() const { return static_cast<size_t>(end - o); }
+  void fast(Value v) { *o++ = enc(v); }
+  bool put(Value v) {
+    if (o == end) return false;
+    *o++ = enc(v);
+    return true;
+  }
+};
+
+// ---- The loop -----------------------------------------------------------------------
+// Converts until the input ends (Done), a character is cut short (Partial, left unread)
+// or the output or the character limit is reached (Full: the character read is in held).
+// Whole runs go through fast(); the tests happen once per run.
+template <class R, class W>
+inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
+  for (;;) {
+    size_t n = std::min(std::min(r.safe(), w.safe()), maxChars - chars);
+    size_t i = 0;
+    for (; i < n; ++i) {
+      Value v;
+      if (!r.fast(v)) break;
+      w.fast(v);
+    }
+    chars += i;
+    Value v;
+    switch (r.get(v)) {
+      case Got::End:
+        return Stop::Done;
+      case Got::Partial:
+        return Stop::Partial;
+      case Got::Char:
+        break;
+    }
+    if (chars >= maxChars || !w.put(v)) {
+      held = v;
+      return Stop::Full;
+    }
+    ++chars;
+  }
+}
+
+// ---- Choosing the pair ------------------------------------------------------------------
+
+// A byte source: single-byte by the locale flag, shift runs only where the caller keeps a
+// state (Ex members and the engine), UTF-8 by arithmetic, else the lead-byte table.
+template <class D8, class DT, class F>
+inline auto withByteReader(const VLLocale *l, bool shiftAware, const uint8_t *s, size_t n, uint8_t state, F &&f) {
+  const VLCodePage *c = l->codePage;
+  if (l->flags & VL_LF_SINGLEBYTE) {
+    SbReader<DT> r(c, s, n);
+    return f(r);
+  }
+  if (shiftAware && cp::isShift(c)) {
+    ShiftReader<DT> r(c, s, n, state);
+    return f(r);
+  }
+  if (cp::isUtf8(c)) {
+    MbReader<Utf8Len, D8> r(c, s, n);
+    return f(r);
+  }
+  MbReader<TableLen, DT> r(c, s, n);
+  return f(r);
+}
+
+template <class F>
+inline auto withUniReader(const VLLocale *l, bool shiftAware, const uint8_t *s, size_t n, uint8_t state, F &&f) {
+  return withByteReader<Utf8Uni, TrieUni>(l, shiftAware, s, n, state, static_cast<F &&>(f));
+}
+
+template <class F>
+inline auto withByteWriter(const VLCodePage *c, bool shiftAware, uint8_t *o, size_t n, uint8_t state, F &&f) {
+  if (shiftAware && cp::isShift(c)) {
+    ShiftWriter<MbEnc> w(c, o, n, state);
+    return f(w);
+  }
+  if (cp::isUtf8(c)) {
+    ByteWriter<Utf8Enc> w(c, o, n);
+    return f(w);
+  }
+  if (cp::maxLen(c) == 1) {
+    ByteWriter<SbEnc> w(c, o, n);
+    return f(w);
+  }
+  ByteWriter<MbEnc> w(c, o, n);
+  return f(w);
+}
+
+// ---- Shared rules of the string members --------------------------------------------------
+
+inline bool usable(const VLLocale *l) { return l && cp::usable(l->codePage); }
+
+// Option words: 0 or VL_OPT_NULLTERM, each with or without VL_OPT_CHARLEN.
+inline bool stdOptions(uint32_t o) { return (o & ~(VL_OPT_NULLTERM | VL_OPT_CHARLEN)) == 0; }
+
+template <class T>
+inline size_t strLen(const T *s) {
+  size_t n = 0;
+  while (s[n]) ++n;
+  return n;
+}
+
+// Bytes taken by the first `chars` characters, for input lengths counted in characters.
+// The caller vouches that they exist.
+inline size_t bytesOfChars(const VLLocale *l, bool shiftAware, const uint8_t *s, uint8_t state, size_t chars) {
+  const VLCodePage *c = l->codePage;
+  if (l->flags & VL_LF_SINGLEBYTE) return chars;
+  size_t at = 0;
+  if (shiftAware && cp::isShift(c)) {
+    uint8_t so = cp::shiftOut(c), si = cp::shiftIn(c);
+    unsigned wide = cp::maxLen(c);
+    for (size_t k = 0; k < chars; ++k) {
+      for (;; ++at) {
+        if (s[at] == so)
+          state = 1;
+        else if (s[at] == si)
+          state = 0;
+        else
+          break;
+      }
+      at += state ? wide : 1;
+    }
+    return at;
+  }
+  for (size_t k = 0; k < chars; ++k) at += cp::lenOf(c, s[at]);
+  return at;
+}
+
+// ---- The string members ---------------------------------------------------------------
+
+// How a string member was asked to end its output.
+struct Shape {
+  int32_t size;    // output size in units (characters with charLen)
+  bool nullTerm;   // VL_OPT_NULLTERM: reserve, write and count a 0
+  bool charLen;    // output size and result count characters
+  bool negIn;      // the input ran to its 0: append one when all fits
+  bool empty;      // nothing to convert
+  unsigned perChar;  // most output units one character takes
+};
+
+template <class W>
+inline bool terminate(W &w, decltype(W::o) limit, size_t &chars, bool countChars, const VLCodePage *c) {
+  if constexpr (requires { w.so; }) {
+    // An open double-byte run is closed first; without room for Shift-In and the 0 the
+    // last double-byte character gives way.
+    if (w.state == 1) {
+      unsigned wide = cp::maxLen(c);
+      if (limit - w.o < 2) {
+        if (static_cast<size_t>(w.o - w.start) < wide) return false;
+        w.o -= wide;
+        if (countChars && chars) --chars;
+      }
+      if (w.o > w.start && w.o[-1] == w.so)
+        --w.o;
+      else
+        *w.o++ = w.si;
+      w.state = 0;
+    }
+  }
+  (void)c;
+  (void)countChars;
+  if (w.o >= limit) return false;
+  *w.o++ = 0;
+  return true;
+}
+
+// Runs reader r into the writer that make(room, body) builds, and ends the output by the
+// shape's rules. Returns the count of units (characters with charLen) written.
+template <class R, class Make>
+inline int32_t drive(R &r, Make &&make, const Shape &s, const VLCodePage *target) {
+  if (s.size <= 0) return 0;
+  size_t size = static_cast<size_t>(s.size);
+  if (s.empty) {
+    if (!s.nullTerm) return 0;
+    return make(size, [&](auto &w) -> int32_t {
+      if constexpr (requires { w.so; })
+        if (w.state == 1 && size >= 2) *w.o++ = w.si;
+      *w.o++ = 0;
+      return 1;
+    });
+  }
+  size_t room = size - (s.nullTerm ? 1 : 0);
+  size_t maxChars = s.charLen ? room : kNoLimit;
+  size_t units = s.charLen ? std::min(room * s.perChar, kNoLimit) : room;
+  return make(units, [&](auto &w) -> int32_t {
+    size_t chars = 0;
+    Value held = 0;
+    Stop st = pump(r, w, chars, maxChars, held);
+    bool wrote = false;
+    if (s.nullTerm)
+      wrote = terminate(w, w.end + 1, chars, s.charLen, target);
+    else if (s.negIn && st == Stop::Done && chars < maxChars)
+      wrote = terminate(w, w.end, chars, s.charLen, target);
+    size_t n = s.charLen ? chars + (s.nullTerm && wrote ? 1 : 0)
+                         : static_cast<size_t>(w.o - w.start) - (wrote && !s.nullTerm ? 1 : 0);
+    return static_cast<int32_t>(n);
+  });
+}
+
+
+// ---- Family members that share a body ------------------------------------------------
+
+// W-form members take 0 or VL_OPT_NULLTERM; VL_OPT_CHARLEN is let through and ignored.
+inline bool wOptions(uint32_t o) { return stdOptions(o); }
+
+inline bool badArgs(const VLLocale *l, int32_t size, const void *out, int32_t len, const void *in) {
+  return !usable(l) || (size > 0 && !out) || (len != 0 && !in);
+}
+
+// Length of a byte input: to its 0 when negative, else counted in characters or bytes.
+inline size_t byteInput(const VLLocale *l, bool ex, const uint8_t *s, uint8_t state, int32_t len, bool charLen) {
+  if (len < 0) return strLen(s);
+  if (charLen) return bytesOfChars(l, ex, s, state, static_cast<size_t>(len));
+  return static_cast<size_t>(len);
+}
+
+inline uint8_t stateOf(VLShiftState s) { return s == 1 ? 1 : 0; }
+
+inline int32_t convertString(VLLocale *target, char *out, VLShiftState ts, int32_t size, VLLocale *source,
+                             const char *in, VLShiftState ss, int32_t len, uint32_t opt, bool ex) {
+  target = orDefault(target);
+  source = orDefault(source);
+  if (!stdOptions(opt) || !usable(source) || badArgs(target, size, out, len, in)) {
+    setRc(target, VL_RC_BADARG);
+    return -1;
+  }
+  bool charLen = (opt & VL_OPT_CHARLEN) != 0;
+  auto *s = reinterpret_cast<const uint8_t *>(in);
+  size_t bytes = len == 0 ? 0 : byteInput(source, ex, s, stateOf(ss), len, charLen);
+  Shape sh{size, (opt & VL_OPT_NULLTERM) != 0, charLen, len < 0, len == 0, 5};
+  const VLCodePage *tc = target->codePage;
+  int32_t n = withUniReader(source, ex, s, bytes, stateOf(ss), [&](auto &r) {
+    return drive(
+        r,
+        [&](size_t room, auto &&body) {
+          return withByteWriter(tc, ex, reinterpret_cast<uint8_t *>(out), room, stateOf(ts), body);
+        },
+        sh, tc);
+  });
+  setRc(target, VL_RC_OK);
+  return n;
+}
+
+inline int32_t stringToUnicode(VLUChar *out, int32_t count, VLLocale *l, const char *in, VLShiftState st,
+                               int32_t len, uint32_t opt, bool ex) {
+  l = orDefault(l);
+  if (!stdOptions(opt) || badArgs(l, count, out, len, in)) {
+    setRc(l, VL_RC_BADARG);
+    return -1;
+  }
+  auto *s = reinterpret_cast<const uint8_t *>(in);
+  bool charLen = (opt & VL_OPT_CHARLEN) != 0;
+  size_t bytes = len == 0 ? 0 : byteInput(l, ex, s, stateOf(st), len, charLen);
+  // Characters in, units out: the output is never counted in characters.
+  Shape sh{count, (opt & VL_OPT_NULLTERM) != 0, false, len < 0, len == 0, 1};
+  int32_t n = withUniReader(l, ex, s, bytes, stateOf(st), [&](auto &r) {
+    return drive(
+        r,
+        [&](size_t room, auto &&body) {
+          U16Writer w(out, room);
+          return body(w);
+        },
+        sh, l->codePage);
+  });
+  setRc(l, VL_RC_OK);
+  return n;
+}
+
+inline int32_t unicodeToString(VLLocale *l, char *out, VLShiftState st, int32_t size, const VLUChar *in,
+                               int32_t len, uint32_t opt, bool ex) {
+  l = orDefault(l);
+  if (!stdOptions(opt) || badArgs(l, size, out, len, in)) {
+    setRc(l, VL_RC_BADARG);
+    return -1;
+  }
+  size_t units = len < 0 ? strLen(in) : static_cast<size_t>(len);
+  Shape sh{size, (opt & VL_OPT_NULLTERM) != 0, (opt & VL_OPT_CHARLEN) != 0, len < 0, len == 0, 5};
+  const VLCodePage *c = l->codePage;
+  U16Reader r(in, units);
+  int32_t n = drive(
+      r,
+      [&](size_t room, auto &&body) {
+        return withByteWriter(c, ex, reinterpret_cast<uint8_t *>(out), room, stateOf(st), body);
+      },
+      sh, c);
+  setRc(l, VL_RC_OK);
+  return n;
+}
+
+// Only the exact word VL_OPT_CHARLEN has an effect; nothing is rejected.
+inline int32_t mbToWide(VLLocale *l, VLWChar *out, int32_t count, const char *in, VLShiftState st, int32_t len,
+                        uint32_t opt, bool ex) {
+  l = orDefault(l);
+  if (badArgs(l, count, out, len, in)) {
+    setRc(l, VL_RC_BADARG);
+    return -1;
+  }
+  auto *s = reinterpret_cast<const uint8_t *>(in);
+  // To the 0 means the 0 too: it becomes a W 0.
+  size_t bytes = len < 0 ? strLen(s) + 1 : len == 0 ? 0 : byteInput(l, ex, s, stateOf(st), len, opt == VL_OPT_CHARLEN);
+  Shape sh{count, false, false, false, bytes == 0, 1};
+  int32_t n = withByteReader<RawW, RawW>(l, ex, s, bytes, stateOf(st), [&](auto &r) {
+    return drive(
+        r,
+        [&](size_t room, auto &&body) {
+          WWriter<SameW> w(l->codePage, out, room);
+          return body(w);
+        },
+        sh, l->codePage);
+  });
+  setRc(l, VL_RC_OK);
+  return n;
+}
+
+// 0 or exactly VL_OPT_CHARLEN; a run left open is not closed.
+inline int32_t wideToMb(VLLocale *l, char *out, VLShiftState st, int32_t size, const VLWChar *in, int32_t count,
+                        uint32_t opt, bool ex) {
+  l = orDefault(l);
+  if ((opt != 0 && opt != VL_OPT_CHARLEN) || badArgs(l, size, out, count, in)) {
+    setRc(l, VL_RC_BADARG);
+    return -1;
+  }
+  size_t values = count < 0 ? strLen(in) + 1 : static_cast<size_t>(count);
+  Shape sh{size, false, opt == VL_OPT_CHARLEN, false, values == 0, 5};
+  const VLCodePage *c = l->codePage;
+  auto *o = reinterpret_cast<uint8_t *>(out);
+  WReader<WSame> r(c, in, values);
+  int32_t n = drive(
+      r,
+      [&](size_t room, auto &&body) -> int32_t {
+        if (ex && cp::isShift(c)) {
+          ShiftWriter<RawEnc> w(c, o, room, stateOf(st));
+          return body(w);
+        }
+        if (l->flags & VL_LF_SINGLEBYTE) {
+          ByteWriter<RawSbEnc> w(c, o, room);
+          return body(w);
+        }
+        ByteWriter<RawEnc> w(c, o, room);
+        return body(w);
+      },
+      sh, c);
+  setRc(l, VL_RC_OK);
+  return n;
+}
+
+}  // namespace vl::cnv
