@@ -96,6 +96,8 @@ VLObjEntry *VLLoadObj(VLObjManager *m, VLObjEntry *e, uint32_t *rcOut) {
   }
   *rc = code;
   VL_ERR("Unable to load object type %d id %d, rc = %d", e->type, e->id, static_cast<int>(code));
-  if (!m->noBuiltinFallback && VLLoadDefaultObj(m, e) == 0) VL_RET(e);
+  // Running out of memory is passing: the entry stays unloaded so that a later call can
+  // load it, rather than being tied to the built-in body for the rest of the process.
+  if (code != VL_RC_NOMEM && !m->noBuiltinFallback && VLLoadDefaultObj(m, e) == 0) VL_RET(e);
   VL_RET(static_cast<VLObjEntry *>(nullptr));
 }

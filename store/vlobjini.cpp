@@ -8,7 +8,8 @@ namespace {
 
 constexpr int kNameSize = 256;
 
-// Tries to open directory/control.nls; false with rc 1003 when the name cannot be built.
+// Tries to open directory/control.nls; false (stop looking) when the name cannot be built
+// (rc 1003) or memory ran out.
 bool openControl(const char *dir, VLFile **file, uint32_t *rc) {
   char name[kNameSize];
   if (!VLGetControlFileName(dir, name, kNameSize)) {
@@ -23,7 +24,8 @@ bool openControl(const char *dir, VLFile **file, uint32_t *rc) {
     *rc = orc;
     VL_ERR("Unable to open %s, err = %d", name, static_cast<int>(orc));
   }
-  return true;
+  // Out of memory is not a reason to look elsewhere.
+  return orc != VL_RC_NOMEM;
 }
 
 // Derives the per-type ranges from a table sorted by type.

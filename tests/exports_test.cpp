@@ -17,11 +17,17 @@ std::set<std::string> publicNames() {
   std::set<std::string> names;
   std::vector<std::filesystem::path> headers = {VL_SOURCE_DIR "/include/veltrin.h", VL_SOURCE_DIR "/include/nls1.h"};
   for (auto &e : std::filesystem::directory_iterator(VL_SOURCE_DIR "/include/veltrin")) headers.push_back(e.path());
-  const std::regex decl(R"(VL_API\s+[^;(\[]*?\b([A-Za-z_][A-Za-z0-9_]*)\s*[;(\[])");
+  // A declaration starts a line with VL_API and names itself before its first '(', ';' or '['.
+  const std::regex decl(R"(^VL_API\s+[^;(\[]*?\b([A-Za-z_][A-Za-z0-9_]*)\s*[;(\[])");
   for (auto &h : headers) {
     std::ifstream in(h);
     std::string text((std::istreambuf_iterator<char>(in)), {});
-    for (std::sregex_iterator it(text.begin(), text.end(), decl), end; it != end; ++it) names.insert((*it)[1]);
+    for (size_t at = text.find("VL_API "); at != std::string::npos; at = text.find("VL_API ", at + 1)) {
+      if (at > 0 && text[at - 1] != '\n') continue;
+      std::smatch m;
+      std::string stmt = text.substr(at, text.find(';', at) - at + 1);
+      if (std::regex_search(stmt, m, decl)) names.insert(m[1]);
+    }
   }
   return names;
 }

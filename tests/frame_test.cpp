@@ -23,7 +23,7 @@ TEST(Paths, SplitPieces) {
       {"name.longext", "", "", "name", ""},               // extension over 4 with its dot
       {"/a/b/..", "", "/a/b/..", "", ""},
       {"/a/.", "", "/a/.", "", ""},
-      {"abcd:/x", "", "", "x", ""},  // a colon too far in is no drive
+      {"abcd:/x", "", "abcd:/", "x", ""},  // a colon too far in is no drive
       {"plain", "", "", "plain", ""},
   };
   for (const auto &c : cases) {
@@ -91,7 +91,8 @@ TEST(Files, TemporaryReplacementAndDiscard) {
     EXPECT_EQ(stat(d.file("xtmp").c_str(), &st), 0);
     EXPECT_EQ(VLCloseFile(f, discard), 0);
     EXPECT_NE(stat(d.file("xtmp").c_str(), &st), 0);
-    std::string got(ts::readFile(x).begin(), ts::readFile(x).end());
+    ts::Bytes bytes = ts::readFile(x);
+    std::string got(bytes.begin(), bytes.end());
     EXPECT_EQ(got, discard ? "old" : "new");
   }
   EXPECT_EQ(VLOpenFile(1, d.file("missing").c_str(), VL_FILE_READ, 0, &rc), nullptr);

@@ -94,7 +94,7 @@ TEST_F(Locale, ModifiableValuesFollowTerritoryAndCodePage) {
   ASSERT_NE(l, nullptr);
   EXPECT_EQ(l->chars[2], ',');
   EXPECT_EQ(l->chars[3], '.');
-  EXPECT_STREQ(l->texts[1], "\xA4") << "euro sign is not in this page: substitution";
+  EXPECT_STREQ(l->texts[1], "\x1A") << "the euro sign is not in this page: substitution";
   EXPECT_EQ(l->textsU[1][0], 0x20AC);
   EXPECT_EQ(l->flags & 0x3F, 0x05);  // flags word 0x0A shifted down by one
 
@@ -104,23 +104,32 @@ TEST_F(Locale, ModifiableValuesFollowTerritoryAndCodePage) {
   EXPECT_EQ(l->chars[2], '.');
   EXPECT_STREQ(l->texts[1], "$");
 
-  // To the shift-sensitive page: texts are converted, punctuation must stay single-byte.
-  VLObjEntry *ebcdic = VLGetObjFromID(vlglobals->objManager, 2, 930, 0, &crc);
-  EXPECT_EQ(VLLocaleChangeCodePage(l, ebcdic), VL_RC_NOSBCSPUNCT) << "'.' has no form in this test page";
-  EXPECT_STREQ(l->codePage->name, "Latin1");
-  EXPECT_STREQ(l->texts[1], "$");
   VLObjEntry *dbcs = VLGetObjFromID(vlglobals->objManager, 2, 932, 0, &crc);
   EXPECT_EQ(VLLocaleChangeCodePage(l, dbcs), 0u);
   EXPECT_EQ(l->flags & (VL_LF_SINGLEBYTE | VL_LF_SHIFT), 0);
   EXPECT_STREQ(l->texts[5], "%H:%M:%S");
+
+  // A group separator that would become double-byte refuses the change, all or nothing.
+  VLLocale *fr = VLGetLocale("German_France.Latin1", 0, &rc);
+  ASSERT_NE(fr, nullptr);
+  EXPECT_EQ(fr->chars[3], 0xA0);
+  char *currency = fr->texts[1];
+  EXPECT_EQ(VLLocaleChangeCodePage(fr, dbcs), VL_RC_NOSBCSPUNCT);
+  EXPECT_STREQ(fr->codePage->name, "Latin1");
+  EXPECT_EQ(fr->texts[1], currency);
+  EXPECT_EQ(fr->flags & VL_LF_SINGLEBYTE, VL_LF_SINGLEBYTE);
+  EXPECT_EQ(VLGetError(fr), static_cast<int32_t>(VL_RC_NOSBCSPUNCT));
+  EXPECT_EQ(VLReleaseLocale(fr), 0u);
   EXPECT_EQ(VLReleaseLocale(l), 0u);
 }
 
 TEST_F(Locale, ShiftSensitiveTexts) {
   ts::TempDir d;
   ts::DefDir defs = ts::DefDir::standard();
-  defs.objects[0].sections[0] = ts::languageBody(840, 930, 0, u"en", u"English");
-  defs.objects[3].sections[0] = ts::territoryBody(u"A\u4E00\u4E01B", u"US", ' ', ' ');
+  for (auto &o : defs.objects) {
+    if (o.name == "English") o.sections[0] = ts::languageBody(840, 930, 0, u"en", u"English");
+    if (o.name == "UnitedStates") o.sections[0] = ts::territoryBody(u"A\u4E00\u4E01B", u"US", ' ', ' ');
+  }
   defs.write(d.path);
   lib_.reset();
   ts::Library lib(d.path.c_str());

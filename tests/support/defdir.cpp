@@ -97,6 +97,7 @@ mkdefs::CpSource doubleByteSource(uint16_t id, const std::string &name) {
       mapBoth(s, seq, u);
     }
   }
+  mapBoth(s, "\x81\x40", 0x00A0);  // a no-break space that is double-byte here
   return s;
 }
 
@@ -116,7 +117,7 @@ mkdefs::CpSource shiftSource(uint16_t id, const std::string &name) {
   // A small EBCDIC repertoire: space, digits, upper and lower letters.
   mapBoth(s, "\x40", ' ');
   mapBoth(s, "\x25", '\n');
-  mapBoth(s, "\x00", 0);
+  mapBoth(s, std::string(1, '\0'), 0);
   for (int i = 0; i < 10; ++i) mapBoth(s, std::string(1, static_cast<char>(0xF0 + i)), static_cast<uint16_t>('0' + i));
   const int upper[] = {0xC1, 0xC2, 0xC3, 0xC4, 0xC5, 0xC6, 0xC7, 0xC8, 0xC9, 0xD1, 0xD2, 0xD3, 0xD4,
                        0xD5, 0xD6, 0xD7, 0xD8, 0xD9, 0xE2, 0xE3, 0xE4, 0xE5, 0xE6, 0xE7, 0xE8, 0xE9};
@@ -150,6 +151,7 @@ DefDir DefDir::standard() {
   d.add(0, 1, "English", {languageBody(840, 367, 0, u"en", u"English")});
   d.add(0, 2, "German", {languageBody(276, 819, 0, u"de", u"German")});
   d.add(1, 276, "Germany", {territoryBody(u"\u20ac", u"DE", ',', '.')});
+  d.add(1, 250, "France", {territoryBody(u"\u20ac", u"FR", ',', 0x00A0)});
   d.add(1, 840, "UnitedStates", {territoryBody(u"$", u"US")});
   auto ascii = singleByteSource(367, "US-ASCII");
   for (int b = 0x80; b < 0x100; ++b) ascii.toUni.erase(std::string(1, static_cast<char>(b)));
