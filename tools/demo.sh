@@ -7,7 +7,7 @@ defs="$build/locale"
 run() { echo "\$ tlx $*"; "$tlx" "$@"; echo; }
 if [ -f "$defs/control.nls" ]; then
   run locale German_Germany.Latin1 --dir "$defs"
-  run locale Japanese_Japan.IBM-930 --dir "$defs"
+  run locale Japanese_Japan.IBM930 --dir "$defs"
   run locale Russian_Russia.MS1251 --dir "$defs"
   run locale French_France.ISO-8859-1 --dir "$defs"
 fi

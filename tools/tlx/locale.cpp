@@ -2,6 +2,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
+#include <string>
 #include <sys/stat.h>
 
 #include "tools/tlx/tlx.h"
@@ -21,6 +22,36 @@ const char *defsDir(const char *given) {
 
 namespace {
 const char *entryName(const VLObjEntry *e, const char *none) { return e ? e->name : none; }
+
+// UTF-16 to UTF-8 for the terminal.
+std::string utf8(const VLUChar *u) {
+  std::string out;
+  for (; u && *u; ++u) {
+    unsigned c = *u;
+    if (c < 0x80) {
+      out += static_cast<char>(c);
+    } else if (c < 0x800) {
+      out += static_cast<char>(0xC0 | c >> 6);
+      out += static_cast<char>(0x80 | (c & 0x3F));
+    } else {
+      out += static_cast<char>(0xE0 | c >> 12);
+      out += static_cast<char>(0x80 | ((c >> 6) & 0x3F));
+      out += static_cast<char>(0x80 | (c & 0x3F));
+    }
+  }
+  return out;
+}
+
+std::string hex(const char *s) {
+  std::string out;
+  char b[4];
+  for (; s && *s; ++s) {
+    std::snprintf(b, sizeof b, "%02X", static_cast<unsigned char>(*s));
+    if (!out.empty()) out += ' ';
+    out += b;
+  }
+  return out;
+}
 }  // namespace
 
 int cmdLocale(int argc, char **argv) {
@@ -56,7 +87,8 @@ int cmdLocale(int argc, char **argv) {
     std::printf("sort          %s\n", entryName(l->sort, "Binary"));
     std::printf("flags         0x%04x%s%s%s\n", l->flags, (l->flags & VL_LF_SINGLEBYTE) ? " single-byte" : "",
                 (l->flags & VL_LF_BINARY) ? " binary-order" : "", (l->flags & VL_LF_SHIFT) ? " shift-sensitive" : "");
-    std::printf("currency      %s\n", l->texts[1] ? l->texts[1] : "");
+    std::printf("currency      %s (in the code page: %s)\n", utf8(l->textsU[1]).c_str(), hex(l->texts[1]).c_str());
+    std::printf("time format   %s\n", utf8(l->textsU[5]).c_str());
     std::printf("last error    %d\n", VLGetError(l));
     VLReleaseLocale(l);
     status = 0;
