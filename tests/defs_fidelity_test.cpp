@@ -16,7 +16,7 @@ namespace {
 
 using namespace mkdefs;
 
-class Generated : public ::testing::Test {
+class DefsGenerated : public ::testing::Test {
  protected:
   static void SetUpTestSuite() {
     if (!std::filesystem::exists(std::string(VL_TEST_DEFS_DIR) + "/control.nls")) return;
@@ -70,7 +70,7 @@ struct Tally {
   }
 };
 
-TEST_F(Generated, EveryCodePageMatchesIconv) {
+TEST_F(DefsGenerated, EveryCodePageMatchesIconv) {
   for (const CodePageDef &def : codeCodePageDefs()) {
     SCOPED_TRACE(def.name);
     Extracted iconvView, built;
@@ -154,7 +154,7 @@ TEST_F(Generated, EveryCodePageMatchesIconv) {
   }
 }
 
-TEST_F(Generated, FamilyConventions) {
+TEST_F(DefsGenerated, FamilyConventions) {
   struct Row {
     uint16_t id;
     uint8_t subst, lf, maxLen;
@@ -186,7 +186,7 @@ TEST_F(Generated, FamilyConventions) {
   }
 }
 
-TEST_F(Generated, NamesAndAliases) {
+TEST_F(DefsGenerated, NamesAndAliases) {
   for (const CodePageDef &def : codeCodePageDefs()) {
     uint32_t rc = 0;
     const VLObjEntry *e = VLGetObjFromName(manager(), VL_OBJ_CODEPAGE, def.name.c_str(),
