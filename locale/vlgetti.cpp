@@ -1,0 +1,17 @@
+// Where an item's text is kept, with the handle's code-page values.
+#include "locale/info.h"
+
+VL_TRACE_MODULE("vlgetti");
+
+const void *VLLocaleGetTextItem(VLLocale *locale, int32_t item, int current, int *kind) {
+  VL_FLOW("VLLocaleGetTextItem");
+  VLLocale *l = vl::orDefault(locale);
+  vl::info::Item it{};
+  if (!l || !vl::info::locate(l, item, current != 0, false, &it)) {
+    vl::setRc(l, VL_RC_BADITEM);
+    VL_RET(static_cast<const void *>(nullptr));
+  }
+  if (kind) *kind = it.kind;
+  vl::setRc(l, VL_RC_OK);
+  VL_RET(it.p);
+}
