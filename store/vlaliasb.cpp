@@ -88,10 +88,8 @@ int VLBuildAliasList(VLObjManager *m) {
     if (!isSpace(*p)) {
       const char *cp = token(p, &n);
       if (n > kNameMax) {
-        char shown[kLine];
-        std::memcpy(shown, cp, n);
-        shown[n] = 0;
-        VL_ERR("codepage name length (%d) for %s exceeds maximum of %d", static_cast<int>(n), shown, 32);
+        line.get()[cp - line.get() + n] = 0;  // the line is read no further
+        VL_ERR("codepage name length (%d) for %s exceeds maximum of %d", static_cast<int>(n), cp, 32);
         rc = 1;
         break;
       }
