@@ -97,7 +97,8 @@ mkdefs::CpSource doubleByteSource(uint16_t id, const std::string &name) {
       mapBoth(s, seq, u);
     }
   }
-  mapBoth(s, "\x81\x40", 0x00A0);  // a no-break space that is double-byte here
+  s.lenByLead[0x80] = 2;
+  mapBoth(s, "\x80\x40", 0x00A0);  // a no-break space that is double-byte here
   return s;
 }
 
