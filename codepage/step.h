@@ -250,6 +250,13 @@ const U<F> *findEol(F f, const U<F> *s, uint32_t n, uint32_t kinds, EolChars e, 
   return nullptr;
 }
 
+// Reports a refused line-end search option word.
+inline void eolRefused(VLLocale *l, uint32_t *kind, int32_t *eolLen) {
+  if (kind) *kind = VL_EOL_BADOPTION;
+  if (eolLen) *eolLen = 0;
+  setRc(l, VL_RC_BADARG);
+}
+
 // Checks a line-end search option word; 0 means line feed. 0 when invalid.
 inline uint32_t eolSearchKinds(uint32_t opts) {
   if (opts == 0) return VL_EOL_LF;

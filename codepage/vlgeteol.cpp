@@ -16,9 +16,7 @@ char *VLGetEol(VLLocale *locale, const char *s, int32_t length, uint32_t *kind, 
   }
   uint32_t kinds = eolSearchKinds(options);
   if (!kinds) {
-    if (kind) *kind = VL_EOL_BADOPTION;
-    if (eolLength) *eolLength = 0;
-    vl::setRc(l, VL_RC_BADARG);
+    eolRefused(l, kind, eolLength);
     VL_RET(static_cast<char *>(nullptr));
   }
   vl::setRc(l, VL_RC_OK);

@@ -10,9 +10,7 @@ VLUChar *VLGetEolU(VLLocale *locale, const VLUChar *s, int32_t length, uint32_t 
   VLLocale *l = vl::orDefault(locale);
   uint32_t kinds = eolSearchKinds(options & ~VL_OPT_CHARLEN);  // a unit is a character
   if (!kinds) {
-    if (kind) *kind = VL_EOL_BADOPTION;
-    if (eolLength) *eolLength = 0;
-    vl::setRc(l, VL_RC_BADARG);
+    eolRefused(l, kind, eolLength);
     VL_RET(static_cast<VLUChar *>(nullptr));
   }
   vl::setRc(l, VL_RC_OK);

@@ -12,9 +12,7 @@ VLWChar *VLGetEolW(VLLocale *locale, const VLWChar *s, int32_t length, uint32_t 
   if (!l) VL_RET(static_cast<VLWChar *>(nullptr));
   uint32_t kinds = eolSearchKinds(options & ~VL_OPT_CHARLEN);  // a unit is a character
   if (!kinds) {
-    if (kind) *kind = VL_EOL_BADOPTION;
-    if (eolLength) *eolLength = 0;
-    vl::setRc(l, VL_RC_BADARG);
+    eolRefused(l, kind, eolLength);
     VL_RET(static_cast<VLWChar *>(nullptr));
   }
   vl::setRc(l, VL_RC_OK);

@@ -17,9 +17,7 @@ char *VLGetEolEx(VLLocale *locale, const char *s, VLShiftState state, int32_t le
   }
   uint32_t kinds = eolSearchKinds(options);
   if (!kinds) {
-    if (kind) *kind = VL_EOL_BADOPTION;
-    if (eolLength) *eolLength = 0;
-    vl::setRc(l, VL_RC_BADARG);
+    eolRefused(l, kind, eolLength);
     VL_RET(static_cast<char *>(nullptr));
   }
   vl::setRc(l, VL_RC_OK);
