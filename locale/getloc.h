@@ -104,9 +104,14 @@ VLLocale *getLocale(const Char *name, uint32_t options, uint32_t *rcOut) {
   if (options & VL_LOCALE_USER) {
     // The user's locale is always a byte string.
     char user[132];
-    int from = userLocaleName(user, sizeof user);
-    (void)from;  // a name from "VL_LANG" is taken as it is; native adjustment comes with native names
-    VL_RET(getLocale<char>(user, options & ~VL_LOCALE_USER, rc));
+    int from = VLGetUserLocale(user, sizeof user);
+    VLLocale *l = getLocale<char>(user, options & ~VL_LOCALE_USER, rc);
+    // A name mapped from the platform also takes the platform's own conventions.
+    if (l && from != 1) {
+      VLMapNativeInfo("", l, 0);
+      l->lastError = 0;
+    }
+    VL_RET(l);
   }
   Block<VLLocale> l(sizeof(VLLocale));
   if (!l) {

@@ -56,8 +56,4 @@ inline uint16_t localeFlagsFor(const VLCodePage *cp) {
   return f;
 }
 
-// The user's locale name when the caller asks for it (option 0x2): "VL_LANG", else the
-// platform's. Returns 1 when the name came from "VL_LANG".
-int userLocaleName(char *out, int size);
-
 }  // namespace vl::loc
