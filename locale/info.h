@@ -54,6 +54,18 @@ inline int objectType(int32_t item) {
   }
 }
 
+// The handle to work on (null: the default locale); null when there is none, or when it
+// lacks an object (a record the caller built by hand), after noting 2 in it.
+inline VLLocale *target(VLLocale *locale) {
+  VLLocale *l = orDefault(locale);
+  if (l && (!l->language || !l->territory || !l->codePage || !loc::body(l->language) || !loc::body(l->territory) ||
+            !cp::body(l->codePage))) {
+    setRc(l, VL_RC_BADARG);
+    return nullptr;
+  }
+  return l;
+}
+
 // ---- Code page facts --------------------------------------------------------------------
 
 inline bool shiftPage(const VLLocale *l) { return (l->flags & VL_LF_SHIFT) != 0; }
@@ -152,7 +164,7 @@ class ByteOut {
     return true;
   }
   int32_t finish() {
-    if (wide_ && (chars_ || used_ + 2 <= size_)) buf_[used_++] = cp::shiftIn(c_);
+    if (wide_ && (chars_ ? size_ >= 2 : used_ + 2 <= size_)) buf_[used_++] = cp::shiftIn(c_);
     buf_[used_++] = 0;
     return static_cast<int32_t>(chars_ ? count_ + 1 : used_);
   }
@@ -267,7 +279,7 @@ using OutChar = std::conditional_t<F == Form::W, VLWChar, std::conditional_t<F =
 template <Form F>
 int32_t getText(VLLocale *locale, int32_t item, OutChar<F> *buffer, VLShiftState state, int32_t size,
                 uint32_t options) {
-  VLLocale *l = orDefault(locale);
+  VLLocale *l = target(locale);
   if (!l) return -1;
   if (options & ~kGetOptions) {
     setRc(l, VL_RC_BADARG);
@@ -369,7 +381,7 @@ using InChar = std::conditional_t<F == Form::Ex, char, OutChar<F>>;
 template <Form F>
 int setText(Tracer &trc, VLLocale *locale, int32_t item, const InChar<F> *data, VLShiftState state, int32_t length,
             uint32_t options) {
-  VLLocale *l = orDefault(locale);
+  VLLocale *l = target(locale);
   if (!l) return 0;
   if ((options & ~kSetOptions) || (!data && length != 0)) {
     setRc(l, VL_RC_BADARG);

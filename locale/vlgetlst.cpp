@@ -5,7 +5,7 @@ VL_TRACE_MODULE("vlgetlst");
 
 char *VLLocaleGetLocaleString(VLLocale *locale, char *buffer) {
   VL_FLOW("VLLocaleGetLocaleString");
-  VLLocale *l = vl::orDefault(locale);
+  VLLocale *l = vl::info::target(locale);
   if (!l || !buffer) {
     vl::setRc(l, VL_RC_BADARG);
     VL_RET(static_cast<char *>(nullptr));

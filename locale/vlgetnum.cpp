@@ -39,7 +39,7 @@ int32_t numInfo(const VLLocale *l, int32_t item, bool defaults) {
 
 int32_t VLGetLocaleNumInfo(VLLocale *locale, int32_t item, int32_t source) {
   VL_FLOW("VLGetLocaleNumInfo");
-  VLLocale *l = vl::orDefault(locale);
+  VLLocale *l = vl::info::target(locale);
   if (!l) VL_RET(-1);
   if (source != 0 && source != 1) {
     vl::setRc(l, VL_RC_BADARG);

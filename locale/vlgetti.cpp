@@ -5,7 +5,7 @@ VL_TRACE_MODULE("vlgetti");
 
 const void *VLLocaleGetTextItem(VLLocale *locale, int32_t item, int current, int *kind) {
   VL_FLOW("VLLocaleGetTextItem");
-  VLLocale *l = vl::orDefault(locale);
+  VLLocale *l = vl::info::target(locale);
   vl::info::Item it{};
   if (!l || !vl::info::locate(l, item, current != 0, false, &it)) {
     vl::setRc(l, VL_RC_BADITEM);

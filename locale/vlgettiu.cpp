@@ -5,7 +5,7 @@ VL_TRACE_MODULE("vlgettiu");
 
 const void *VLLocaleGetTextItemU(VLLocale *locale, int32_t item, int current, int *kind) {
   VL_FLOW("VLLocaleGetTextItemU");
-  VLLocale *l = vl::orDefault(locale);
+  VLLocale *l = vl::info::target(locale);
   vl::info::Item it{};
   if (!l || !vl::info::locate(l, item, current != 0, true, &it)) {
     vl::setRc(l, VL_RC_BADITEM);

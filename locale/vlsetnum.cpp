@@ -42,7 +42,7 @@ uint32_t setNum(VLLocale *l, int32_t item, uint16_t v) {
 
 int VLSetLocaleNumInfo(VLLocale *locale, int32_t item, int32_t value, uint32_t) {
   VL_FLOW("VLSetLocaleNumInfo");
-  VLLocale *l = vl::orDefault(locale);
+  VLLocale *l = vl::info::target(locale);
   if (!l) VL_RET(0);
   VL_DETAIL("type = %d, value = %d", static_cast<int>(item), static_cast<int>(value));
   uint32_t rc = setNum(l, item, static_cast<uint16_t>(value));

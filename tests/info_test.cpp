@@ -4,6 +4,7 @@
 
 #include <cstring>
 #include <filesystem>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -30,7 +31,7 @@ std::string getEx(VLLocale *l, int item, VLShiftState state, int32_t size = 512)
 }
 
 // Every item through the plain, Ex, W and U getters, from both sources: the same text.
-void checkAllForms(VLLocale *l, const std::string &what) {
+void checkAllForms(VLLocale *l, const std::string &what, bool unicodeToo = true) {
   const VLCodePage *cp = l->codePage;
   const bool shift = (l->flags & VL_LF_SHIFT) != 0;
   for (int item = 0; item <= 90; ++item) {
@@ -69,7 +70,7 @@ void checkAllForms(VLLocale *l, const std::string &what) {
       // value has no single byte reads as empty in the code page only).
       unsigned char fromU[1024] = {0};
       int32_t k = VLCpUnicodeToStr(cp, u, nu - 1, 0, fromU);
-      if (!(charItem(item) && np == 1)) {
+      if (unicodeToo && !(charItem(item) && np == 1)) {
         EXPECT_EQ(std::string(reinterpret_cast<char *>(fromU), k), std::string(plain, np - 1));
       }
     }
@@ -171,6 +172,10 @@ TEST_F(Info, SizesSourcesAndOptions) {
   EXPECT_EQ(VLGetError(l), VL_RC_BADARG);
   EXPECT_EQ(VLGetLocaleNumInfo(l, 63, 2), -1);
   EXPECT_EQ(VLGetError(l), VL_RC_BADARG);
+  VLLocale blank{};  // a record without objects
+  EXPECT_EQ(VLGetLocaleTextInfo(&blank, 2, b, 16, 0), -1);
+  EXPECT_EQ(VLSetLocaleNumInfo(&blank, 63, 1, 0), 0);
+  EXPECT_EQ(blank.lastError, static_cast<int32_t>(VL_RC_BADARG));
   // A double-byte character never split: U+4E01 is 0x81 0x41 here.
   ASSERT_EQ(VLSetLocaleTextInfo(l, 64, "A\x81\x41" "B", -1, 0), 1);
   EXPECT_EQ(get(l, 64, 0, 3), "A");
@@ -357,6 +362,53 @@ TEST_F(Info, ShiftStatesInAnEbcdicPage) {
   EXPECT_EQ(VLGetLocaleTextInfoU(l, 71, u, 8, 0), 3);
   EXPECT_EQ(u[1], 0x4E00);
   VLReleaseLocale(l);
+}
+
+// Arbitrary bytes, lengths and options through every setter: nothing breaks, and the
+// byte forms still agree (arbitrary bytes need not be characters, so UTF-16 may differ).
+TEST_F(Info, ArbitraryInputKeepsTheFormsInAgreement) {
+  std::mt19937 rng(12345);
+  for (const char *name : {"German_Germany.Latin1", "English.MS932", "German_UnitedStates.IBM-930"}) {
+    VLLocale *l = open(name);
+    ASSERT_NE(l, nullptr) << name;
+    for (int round = 0; round < 400; ++round) {
+      char data[48];
+      VLWChar w[12];
+      VLUChar u[12];
+      for (char &c : data) c = static_cast<char>(rng() % 4 ? rng() % 256 : "\x0E\x0F\x81,.;0"[rng() % 7]);
+      for (VLWChar &c : w) c = rng() % 2 ? rng() % 0x100 : 0x8100 + rng() % 0x200;
+      for (VLUChar &c : u) c = static_cast<VLUChar>(rng() % 2 ? rng() % 0x80 : rng());
+      data[47] = 0;
+      w[11] = 0;
+      u[11] = 0;
+      int item = 55 + static_cast<int>(rng() % 30);
+      int32_t len = static_cast<int32_t>(rng() % 14) - 2;
+      uint32_t opt = rng() % 3 ? 0 : VL_OPT_CHARLEN;
+      switch (rng() % 4) {
+        case 0: VLSetLocaleTextInfo(l, item, data, len, opt); break;
+        case 1: VLSetLocaleTextInfoEx(l, item, data, rng() % 2, len, opt); break;
+        case 2: VLSetLocaleTextInfoW(l, item, w, len, opt); break;
+        default: VLSetLocaleTextInfoU(l, item, u, len, opt); break;
+      }
+    }
+    checkAllForms(l, std::string("arbitrary ") + name, false);
+    VLReleaseLocale(l);
+  }
+}
+
+// The tool prints items numbered and named, and marks what the handle overrides.
+TEST_F(Info, ToolListsItems) {
+  std::string cmd = std::string(VL_TEST_TLX) + " info German_Germany.Latin1 --items 2,59-60,88 --dir " + dir_->path;
+  FILE *p = popen(cmd.c_str(), "r");
+  ASSERT_NE(p, nullptr);
+  std::string out;
+  char line[256];
+  while (fgets(line, sizeof line, p)) out += line;
+  EXPECT_EQ(pclose(p), 0);
+  EXPECT_NE(out.find("  2   language name"), std::string::npos) << out;
+  EXPECT_NE(out.find(" 59   decimal separator              \",\""), std::string::npos) << out;
+  EXPECT_NE(out.find(" 88   locale name                    \"German_Germany.Latin1@Binary\""), std::string::npos) << out;
+  EXPECT_EQ(out.find(" 16 "), std::string::npos) << "only the items asked for";
 }
 
 }  // namespace
