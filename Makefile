@@ -1,9 +1,10 @@
 # Two entry points: `make demo` and `make test`. Both set the machine up first.
 BUILD      ?= build
 ASAN_BUILD ?= build-asan
+TSAN_BUILD ?= build-tsan
 JOBS       ?= $(shell nproc)
 
-.PHONY: all setup build asan demo test bench clean
+.PHONY: all setup build asan tsan demo test bench clean
 
 all: build
 
@@ -16,11 +17,19 @@ $(BUILD)/CMakeCache.txt: | setup
 $(ASAN_BUILD)/CMakeCache.txt: | setup
 	cmake -S . -B $(ASAN_BUILD) -DCMAKE_BUILD_TYPE=Debug -DVL_SANITIZE=ON -DVL_BENCH=OFF
 
+$(TSAN_BUILD)/CMakeCache.txt: | setup
+	cmake -S . -B $(TSAN_BUILD) -DCMAKE_BUILD_TYPE=RelWithDebInfo -DVL_TSAN=ON -DVL_BENCH=OFF
+
 build: setup $(BUILD)/CMakeCache.txt
 	cmake --build $(BUILD) -j $(JOBS)
 
 asan: setup $(ASAN_BUILD)/CMakeCache.txt
 	cmake --build $(ASAN_BUILD) -j $(JOBS)
+
+# The thread tests under ThreadSanitizer, in a build of their own; a race fails the run.
+tsan: setup $(TSAN_BUILD)/CMakeCache.txt
+	cmake --build $(TSAN_BUILD) -j $(JOBS) --target tlx_tests
+	cd $(TSAN_BUILD) && TSAN_OPTIONS="halt_on_error=1 second_deadlock_stack=1" ./tlx_tests --gtest_brief=1 --gtest_filter='ServiceThreads.*'
 
 demo: build
 	@tools/demo.sh $(BUILD)
@@ -33,4 +42,4 @@ bench: build
 	$(BUILD)/tlx_bench
 
 clean:
-	rm -rf $(BUILD) $(ASAN_BUILD)
+	rm -rf $(BUILD) $(ASAN_BUILD) $(TSAN_BUILD)
