@@ -14,6 +14,10 @@
 
 #include "codepage/cpprim.h"
 
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
+
 namespace vl::cnv {
 
 using Value = uint32_t;
@@ -21,6 +25,73 @@ constexpr size_t kNoLimit = SIZE_MAX / 8;
 
 enum class Got { Char, End, Partial };
 enum class Stop { Done, Partial, Full };
+
+// ---- Plain runs -----------------------------------------------------------------------
+// Most text is mostly ASCII, and many pages map the first 128 (or all 256) bytes to the
+// same UTF-16 values. Where both sides of a conversion agree on that, a stretch of such
+// characters is a widening or narrowing copy, 16 at a time. A side reports the bound
+// below which its values are plain: 0 (none), 0x80 or 0x100.
+
+// Bytes that decode to themselves (as one-byte characters, when a length table is given).
+inline unsigned plainIn(const uint8_t *sb, const uint8_t *len) {
+  unsigned b = 0;
+  for (; b < 0x100; ++b)
+    if (rd16(sb + 2u * b) != b || (len && len[b] != 1)) break;
+  return b >= 0x100 ? 0x100 : b >= 0x80 ? 0x80 : 0;
+}
+
+// Units that encode to the byte of the same value.
+inline unsigned plainOut(const VLCodePage *c) {
+  const uint8_t *x = cp::body(c) + cp::kIndex, *low = cp::lowTable(c);
+  if (!low || x[0] != 0 || x[2] != 0) return 0;
+  const uint8_t *tab = low + rd16(x + 4);
+  unsigned l = 0;
+  for (; l <= x[3]; ++l)
+    if (tab[l & x[1]] != l) break;
+  return l >= 0x100 ? 0x100 : l >= 0x80 ? 0x80 : 0;
+}
+
+// Copies whole blocks of 16 plain values while they last; returns how many. A block that
+// is not all plain is left to the per-character loop, which costs no more than a scalar
+// scan for its end would.
+inline size_t plainCopy(const uint8_t *s, VLUChar *d, size_t n, unsigned lim) {
+  size_t i = 0;
+#ifdef __SSE2__
+  const __m128i z = _mm_setzero_si128();
+  for (; i + 16 <= n; i += 16) {
+    __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
+    if (lim < 0x100 && _mm_movemask_epi8(x)) break;
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i), _mm_unpacklo_epi8(x, z));
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i + 8), _mm_unpackhi_epi8(x, z));
+  }
+#endif
+  return i;
+}
+inline size_t plainCopy(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) {
+  size_t i = 0;
+#ifdef __SSE2__
+  const __m128i z = _mm_setzero_si128(), high = _mm_set1_epi16(static_cast<short>(lim < 0x100 ? 0xFF80 : 0xFF00));
+  for (; i + 16 <= n; i += 16) {
+    __m128i a = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
+    __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i + 8));
+    __m128i t = _mm_and_si128(_mm_or_si128(a, b), high);
+    if (_mm_movemask_epi8(_mm_cmpeq_epi16(t, z)) != 0xFFFF) break;
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i), _mm_packus_epi16(a, b));
+  }
+#endif
+  return i;
+}
+inline size_t plainCopy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) {
+  size_t i = 0;
+#ifdef __SSE2__
+  for (; i + 16 <= n; i += 16) {
+    __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
+    if (lim < 0x100 && _mm_movemask_epi8(x)) break;
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i), x);
+  }
+#endif
+  return i;
+}
 
 // ---- Decoders: the bytes of one character to a value ---------------------------------
 
@@ -72,6 +143,16 @@ struct SbReader {
   }
   unsigned need(uint8_t) const { return 1; }
   Value decode(const uint8_t *q, unsigned) const { return d.one(q[0]); }
+  unsigned plain = ~0u;  // plainBelow, once known
+  unsigned plainBelow() {
+    if (plain == ~0u) {
+      if constexpr (requires { d.sb; })
+        plain = plainIn(d.sb, nullptr);
+      else
+        plain = 0;
+    }
+    return plain;
+  }
 };
 
 // Length from the lead byte: the code page's table, or UTF-8 arithmetic.
@@ -111,6 +192,18 @@ struct MbReader {
   }
   unsigned need(uint8_t lead) const { return len(lead); }
   Value decode(const uint8_t *q, unsigned n) const { return n == 1 ? d.one(q[0]) : d.multi(q, n); }
+  unsigned plain = ~0u;
+  unsigned plainBelow() {
+    if (plain == ~0u) {
+      if constexpr (!requires { d.sb; })
+        plain = 0;
+      else if constexpr (requires { len.t; })
+        plain = plainIn(d.sb, len.t);
+      else
+        plain = std::min(plainIn(d.sb, nullptr), 0x80u);
+    }
+    return plain;
+  }
 };
 
 // Shift-Out/Shift-In runs: maximum-length characters in state 1, single bytes in state 0.
@@ -154,6 +247,7 @@ struct ShiftReader {
     return Got::Char;
   }
   unsigned need(uint8_t) const { return state ? wide : 1; }
+  unsigned plainBelow() const { return 0; }
   Value decode(const uint8_t *q, unsigned n) const { return n == 1 ? d.one(q[0]) : d.multi(q, n); }
 };
 
@@ -161,6 +255,7 @@ struct U16Reader {
   const VLUChar *p, *end;
   uint8_t state = 0;
   U16Reader(const VLUChar *s, size_t n) : p(s), end(s + n) {}
+  unsigned plainBelow() const { return 0x10000; }
   size_t safe() const { return static_cast<size_t>(end - p); }
   bool fast(Value &v) {
     v = *p++;
@@ -206,18 +301,18 @@ struct WReader {
 // ---- Encoders: a value to the bytes of one character ---------------------------------
 // kMax: the most bytes one value gives.
 
-// Single-byte target: the index entry of the last high byte is kept with its bounds, so a
-// run in one block of 256 units is a compare and a byte load per unit.
-struct SbEnc {
+// A code page target: the index entry of the last high byte is kept with its bounds, so a
+// run in one block of 256 units is a compare and a table load per unit.
+struct IndexEnc {
   static constexpr unsigned kMax = 4;
   const VLCodePage *cp;
   const uint8_t *index, *low;
   const uint8_t *entry = nullptr;
   const uint8_t *tab = nullptr;
   unsigned high = 0x100, lo = 1, hi = 0, mask = 0;
-  bool byte = false;
+  uint8_t kind = 0xFF;
   uint8_t sub;
-  explicit SbEnc(const VLCodePage *c)
+  explicit IndexEnc(const VLCodePage *c)
       : cp(c), index(cp::body(c) + cp::kIndex), low(cp::lowTable(c)), sub(cp::subst(c)) {}
   void load(unsigned h) {
     high = h;
@@ -225,7 +320,7 @@ struct SbEnc {
     lo = entry[2];
     hi = entry[3];
     mask = entry[1];
-    byte = entry[0] == 0;
+    kind = entry[0];
     tab = low ? low + rd16(entry + 4) : nullptr;
     if (!tab) lo = 1, hi = 0;
   }
@@ -236,22 +331,24 @@ struct SbEnc {
       out[0] = sub;
       return 1;
     }
-    if (byte) {
+    if (kind == 0) {
       out[0] = tab[l & mask];
+      return 1;
+    }
+    if (kind == 1) {
+      unsigned v = rd16(tab + 2u * (l & mask));
+      if (v > 0xFF) {
+        out[0] = static_cast<uint8_t>(v >> 8);
+        out[1] = static_cast<uint8_t>(v);
+        return 2;
+      }
+      out[0] = static_cast<uint8_t>(v);
       return 1;
     }
     return static_cast<unsigned>(cp::wToMb(out, cp::indexValue(cp, entry, static_cast<VLUChar>(u))));
   }
 };
 
-struct MbEnc {
-  static constexpr unsigned kMax = 4;
-  const VLCodePage *cp;
-  explicit MbEnc(const VLCodePage *c) : cp(c) {}
-  unsigned operator()(Value u, uint8_t *out) const {
-    return static_cast<unsigned>(cp::uniToMb(cp, static_cast<VLUChar>(u), out));
-  }
-};
 
 struct Utf8Enc {
   static constexpr unsigned kMax = 3;
@@ -291,6 +388,18 @@ struct ByteWriter {
   E enc;
   uint8_t state = 0;
   ByteWriter(const VLCodePage *c, uint8_t *s, size_t n, uint8_t = 0) : start(s), o(s), end(s + n), enc(c) {}
+  unsigned plain = ~0u;
+  unsigned plainBelow() {
+    if (plain == ~0u) {
+      if constexpr (requires { enc.cp; })
+        plain = plainOut(enc.cp);
+      else if constexpr (E::kMax == 3)
+        plain = 0x80;  // UTF-8
+      else
+        plain = 0;
+    }
+    return plain;
+  }
   size_t safe() const { return static_cast<size_t>(end - o) / E::kMax; }
   void fast(Value v) { o += enc(v, o); }
   bool put(Value v) {
@@ -313,6 +422,7 @@ struct ShiftWriter {
   ShiftWriter(const VLCodePage *c, uint8_t *s, size_t n, uint8_t st)
       : start(s), o(s), end(s + n), enc(c), state(st ? 1 : 0), so(cp::shiftOut(c)), si(cp::shiftIn(c)) {}
   size_t safe() const { return static_cast<size_t>(end - o) / (E::kMax + 1); }
+  unsigned plainBelow() const { return 0; }
   // The character's bytes behind the shift byte it needs, if any.
   unsigned form(Value v, uint8_t *b) {
     unsigned n = enc(v, b + 1);
@@ -359,6 +469,7 @@ struct U16Writer {
   VLUChar *start, *o, *end;
   uint8_t state = 0;
   U16Writer(VLUChar *s, size_t n) : start(s), o(s), end(s + n) {}
+  unsigned plainBelow() const { return 0x10000; }
   size_t safe() const { return static_cast<size_t>(end - o); }
   void fast(Value v) { *o++ = static_cast<VLUChar>(v); }
   bool put(Value v) {
@@ -402,13 +513,45 @@ template <class R, class W>
 inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
   for (;;) {
     size_t n = std::min(std::min(r.safe(), w.safe()), maxChars - chars);
-    size_t i = 0;
-    for (; i < n; ++i) {
-      Value v;
-      if (!r.fast(v)) break;
-      w.fast(v);
+    if (n) {
+      // Local copies keep the positions in registers through the run.
+      R lr = r;
+      W lw = w;
+      size_t i = 0;
+      unsigned lim = 0;
+      if constexpr (requires { plainCopy(lr.p, lw.o, n, 0u); }) {
+        if (n >= 32) lim = std::min(lr.plainBelow(), lw.plainBelow());
+        if (lim < 0x100) lim = 0;
+        if (lim >= 0x80) {
+          lim = lim >= 0x100 ? 0x100 : 0x80;
+          while (i < n) {
+            size_t k = plainCopy(lr.p, lw.o, n - i, lim);
+            lr.p += k;
+            lw.o += k;
+            i += k;
+            // Text that keeps breaking the blocks gets longer stretches between tries.
+            size_t m = std::min<size_t>(n - i, k ? 16 : 256), j = 0;
+            for (; j < m; ++j) {
+              Value v;
+              if (!lr.fast(v)) break;
+              lw.fast(v);
+            }
+            i += j;
+            if (j < m) break;
+          }
+        }
+      }
+      if (lim < 0x80) {
+        for (; i < n; ++i) {
+          Value v;
+          if (!lr.fast(v)) break;
+          lw.fast(v);
+        }
+      }
+      r = lr;
+      w = lw;
+      chars += i;
     }
-    chars += i;
     Value v;
     switch (r.get(v)) {
       case Got::End:
@@ -457,18 +600,14 @@ inline auto withUniReader(const VLLocale *l, bool shiftAware, const uint8_t *s, 
 template <class F>
 inline auto withByteWriter(const VLCodePage *c, bool shiftAware, uint8_t *o, size_t n, uint8_t state, F &&f) {
   if (shiftAware && cp::isShift(c)) {
-    ShiftWriter<MbEnc> w(c, o, n, state);
+    ShiftWriter<IndexEnc> w(c, o, n, state);
     return f(w);
   }
   if (cp::isUtf8(c)) {
     ByteWriter<Utf8Enc> w(c, o, n);
     return f(w);
   }
-  if (cp::maxLen(c) == 1) {
-    ByteWriter<SbEnc> w(c, o, n);
-    return f(w);
-  }
-  ByteWriter<MbEnc> w(c, o, n);
+  ByteWriter<IndexEnc> w(c, o, n);
   return f(w);
 }
 
