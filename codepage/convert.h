@@ -97,11 +97,23 @@ inline size_t plainCopy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) {
 
 // One-byte characters through the single-byte table; longer ones through the trie.
 struct TrieUni {
-  const VLCodePage *cp;
-  const uint8_t *sb;
-  explicit TrieUni(const VLCodePage *c) : cp(c), sb(cp::body(c) + cp::kSbcsUni) {}
+  const uint8_t *sb, *t, *values;
+  explicit TrieUni(const VLCodePage *c)
+      : sb(cp::body(c) + cp::kSbcsUni), t(cp::trie(c)), values(t ? t + cp::off(c, cp::kValueOff) : nullptr) {}
   Value one(uint8_t b) const { return rd16(sb + 2u * b); }
-  Value multi(const uint8_t *p, unsigned n) const { return cp::trieToUni(cp, p, n); }
+  // The trie walk of the primitives, with the block and value addresses held.
+  Value multi(const uint8_t *p, unsigned n) const {
+    if (!t) return cp::kReplacement;
+    const uint8_t *node = t;
+    for (unsigned i = 0; i < n; ++i) {
+      unsigned b = p[i];
+      if (b < node[2] || b > node[3]) return cp::kReplacement;
+      unsigned at = rd16(node + 4) + (b & node[1]);
+      if (node[0]) return rd16(values + 2u * at);
+      node = t + cp::kNodeSize * at;
+    }
+    return cp::kReplacement;
+  }
 };
 
 // UTF-8 by arithmetic; one-byte characters still through the table.
@@ -324,7 +336,7 @@ struct IndexEnc {
     tab = low ? low + rd16(entry + 4) : nullptr;
     if (!tab) lo = 1, hi = 0;
   }
-  unsigned operator()(Value u, uint8_t *out) {
+  [[gnu::always_inline]] unsigned operator()(Value u, uint8_t *out) {
     unsigned h = (u >> 8) & 0xFF, l = u & 0xFF;
     if (h != high) load(h);
     if (l < lo || l > hi) {
@@ -345,6 +357,10 @@ struct IndexEnc {
       out[0] = static_cast<uint8_t>(v);
       return 1;
     }
+    return wide(u, out);
+  }
+  // Characters of three or four bytes: the primitives' own reading of the entry.
+  [[gnu::noinline]] unsigned wide(Value u, uint8_t *out) const {
     return static_cast<unsigned>(cp::wToMb(out, cp::indexValue(cp, entry, static_cast<VLUChar>(u))));
   }
 };
