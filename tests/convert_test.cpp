@@ -405,6 +405,26 @@ TEST_F(ConvertGenerated, ToolAgreesWithIconvOnEveryCodePage) {
     std::string id = std::to_string(spec.id);
     EXPECT_EQ(hex(runTool("-f UTF-16LE -t " + id, u16Path)), hex(cpBytes));
     EXPECT_EQ(runTool("-f " + spec.name + " -t UTF-16LE", cpPath) == u16, true);
+    // The one-shot members over the whole text: long runs take the loop's bulk paths.
+    std::vector<VLUChar> units(text.size() + 1);
+    ASSERT_EQ(VLStringToUnicodeEx(units.data(), static_cast<int32_t>(units.size()), &loc, cpBytes.data(), 0,
+                                  static_cast<int32_t>(cpBytes.size()), 0),
+              static_cast<int32_t>(text.size()));
+    EXPECT_TRUE(std::equal(text.begin(), text.end(), units.begin()));
+    std::vector<char> back(cpBytes.size() + 8);
+    ASSERT_EQ(VLUnicodeToStringEx(&loc, back.data(), 0, static_cast<int32_t>(back.size()),
+                                  reinterpret_cast<const VLUChar *>(text.data()), static_cast<int32_t>(text.size()),
+                                  VL_OPT_NULLTERM),
+              static_cast<int32_t>(cpBytes.size() + 1));
+    EXPECT_EQ(hex(Bytes(back.data(), cpBytes.size())), hex(cpBytes));
+    // A unit the page lacks, inside a run of plain ones, still becomes the substitution byte
+    // (UTF-8 lacks none).
+    std::u16string plain(40, u'a');
+    plain[21] = spec.id == VL_CP_UTF8 ? u'b' : u'\uFFFD';
+    char sub[48];
+    ASSERT_EQ(VLUnicodeToString(&loc, sub, 48, reinterpret_cast<const VLUChar *>(plain.data()), 40, 0), 40);
+    EXPECT_EQ(static_cast<uint8_t>(sub[21]), spec.id == VL_CP_UTF8 ? 'b' : vl::cp::subst(e));
+    EXPECT_EQ(sub[20], sub[22]);
     // Split reads: the engine, code page to code page, in every chunk size.
     uint32_t rc2;
     VLObjEntry *utf8 = VLGetObjFromID(vlglobals->objManager, VL_OBJ_CODEPAGE, VL_CP_UTF8, 0, &rc2);
