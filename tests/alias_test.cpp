@@ -1,4 +1,5 @@
-// Code page aliases: the file's rules and limits, the list they build, and lookups.
+// Code page aliases: the file's rules and limits, the list they build, and lookups;
+// language special-case tables.
 #include <gtest/gtest.h>
 
 #include <cstdio>
@@ -94,6 +95,44 @@ TEST_F(Alias, Lookup) {
   ASSERT_NE(l, nullptr);
   EXPECT_STREQ(l->codePage->name, "Latin1");
   VLReleaseLocale(l);
+}
+
+// Special-case tables 44 and 45 of a language body: entries of key pair and result pair.
+TEST(LangSpecial, Tables) {
+  ts::TempDir dir;
+  ts::DefDir d = ts::DefDir::standard();
+  ts::Bytes b = ts::languageBody(840, 367, 0, u"tr", u"Turkish");
+  const uint16_t t44[][4] = {{0x69, 0, 0x130, 0}, {0xDF, 0, 0x53, 0x53}, {0x69, 0x307, 0x49, 0}, {0x69, 0, 0x49, 0}};
+  const uint16_t t45[][4] = {{0x49, 0, 0x131, 0}};
+  mkdefs::set16(b, 6, 4);
+  mkdefs::set16(b, 8, 1);
+  mkdefs::set16(b, 98, static_cast<uint16_t>(b.size()));
+  for (auto &e : t44)
+    for (uint16_t v : e) mkdefs::put16(b, v);
+  mkdefs::set16(b, 100, static_cast<uint16_t>(b.size()));
+  for (auto &e : t45)
+    for (uint16_t v : e) mkdefs::put16(b, v);
+  d.objects[0].sections[0] = b;
+  d.write(dir.path);
+  ts::Library lib(dir.path.c_str());
+  uint32_t rc;
+  const VLObjEntry *lang = VLGetObjFromID(vlglobals->objManager, 0, 1, 0, &rc);
+  ASSERT_NE(lang, nullptr);
+  struct Case {
+    VLUChar first, second;
+    int table, result;
+    VLUChar out1, out2;
+  } cases[] = {
+      {0x69, 0, 44, 1, 0x130, 0},  // the first matching entry wins
+      {0xDF, 0, 44, 2, 0x53, 0x53}, {0x69, 0x307, 44, 1, 0x49, 0}, {0x49, 0, 45, 1, 0x131, 0},
+      {0x49, 0, 44, 0, 0, 0},       {0x69, 0, 45, 0, 0, 0},        {0x69, 0, 46, 0, 0, 0},
+  };
+  for (const Case &c : cases) {
+    VLUChar o1 = 0, o2 = 0;
+    EXPECT_EQ(VLLangGetSpecial(lang, c.first, c.second, &o1, &o2, c.table), c.result) << c.first << " " << c.table;
+    EXPECT_EQ(o1, c.out1);
+    EXPECT_EQ(o2, c.out2);
+  }
 }
 
 }  // namespace
