@@ -8,6 +8,7 @@
 #include <cstring>
 
 #include "codepage/cpbody.h"
+#include "codepage/cpprim.h"
 #include "frame/frame.h"
 
 namespace vl::step {
@@ -291,7 +292,6 @@ inline uint32_t eolPutKinds(uint32_t opts) {
 }
 
 // ---- Classification -------------------------------------------------------------------
-constexpr uint32_t kUnassigned = 0x400;
 
 // Picks the selected bits of a type word; false for an unknown selector (bits 0-9 then).
 inline bool selectType(uint32_t word, uint32_t selector, uint32_t *out) {
@@ -302,6 +302,41 @@ inline bool selectType(uint32_t word, uint32_t selector, uint32_t *out) {
     default: *out = word & 0x3FF; return false;
   }
 }
-inline uint32_t recordType(const VLCtypeRecord *r) { return r ? r->type : kUnassigned; }
+// Type word of a UTF-16 unit; the stretches between the tables are uniform.
+inline uint32_t unicodeType(uint32_t u) {
+  if (u <= VL_UNICODE_CTYPE1_LAST) return VL_UNICODE_Ctype1[u];
+  if (u < VL_UNICODE_CTYPE2_FIRST) return 0x400;
+  if (u <= VL_UNICODE_CTYPE2_LAST) return VL_UNICODE_Ctype2[u - VL_UNICODE_CTYPE2_FIRST];
+  if (u < VL_UNICODE_CTYPE3_FIRST) return 0x400;
+  if (u <= VL_UNICODE_CTYPE3_LAST) return VL_UNICODE_Ctype3[u - VL_UNICODE_CTYPE3_FIRST];
+  if (u < VL_UNICODE_CTYPE4_FIRST) return 0x400;
+  if (u <= VL_UNICODE_CTYPE4_LAST) return VL_UNICODE_Ctype4[u - VL_UNICODE_CTYPE4_FIRST];
+  if (u < VL_UNICODE_CTYPE5_FIRST) {  // mathematical operators
+    if (u == 0x2212 || u == 0x2213) return 0x2008020;
+    return u == 0x221E ? 0x200020 : 0x2200020;
+  }
+  if (u <= VL_UNICODE_CTYPE5_LAST) return VL_UNICODE_Ctype5[u - VL_UNICODE_CTYPE5_FIRST];
+  if (u < VL_UNICODE_CTYPE6_FIRST) return 0x400;
+  if (u <= VL_UNICODE_CTYPE6_LAST) return VL_UNICODE_Ctype6[u - VL_UNICODE_CTYPE6_FIRST];
+  if (u < 0x4E00) return 0x400;
+  if (u <= 0x9FA5) return 0x40000801;  // ideographs
+  if (u < 0xAC00) return 0x400;
+  if (u <= 0xD7A3) return 0x801;  // Hangul syllables
+  if (u < 0xF900) return 0x400;
+  if (u <= 0xFA2D) return 0x40000801;
+  if (u < VL_UNICODE_CTYPE7_FIRST) return 0x400;
+  if (u <= VL_UNICODE_CTYPE7_LAST) return VL_UNICODE_Ctype7[u - VL_UNICODE_CTYPE7_FIRST];
+  if (u < VL_UNICODE_CTYPE8_FIRST) return u == 0xFBE9 || u == 0xFCE1 ? 0x400 : 0x1001;  // Arabic forms
+  return VL_UNICODE_Ctype8[u - VL_UNICODE_CTYPE8_FIRST];
+}
+
+// Type word of a multi-byte character or W value. UTF-8 carries no type tables of its
+// own: its characters are decoded and classified as Unicode.
+inline uint32_t mbType(const VLCodePage *c, const uint8_t *p, unsigned n) {
+  return cp::isUtf8(c) ? unicodeType(cp::utf8ToUni(p)) : cp::ctypeOf(c, p, n)->type;
+}
+inline uint32_t wType(const VLCodePage *c, VLWChar v) {
+  return cp::isUtf8(c) ? unicodeType(cp::wToUni(c, v)) : cp::ctypeOfW(c, v)->type;
+}
 
 }  // namespace vl::step

@@ -11,7 +11,7 @@ uint32_t VLGetCharType(VLLocale *locale, const char *p, uint32_t selector) {
   if (!l || !p) VL_RET(uint32_t{0});
   const VLCodePage *c = l->codePage;
   uint32_t len = bytesOf(l).len(ub(p));
-  uint32_t word = len == 1 ? vl::cp::sbcsType(c, ub(p)[0]) : vl::cp::ctypeOf(c, ub(p), len)->type;
+  uint32_t word = len == 1 ? vl::cp::sbcsType(c, ub(p)[0]) : mbType(c, ub(p), len);
   uint32_t out;
   vl::setRc(l, selectType(word, selector, &out) ? VL_RC_OK : VL_RC_BADARG);
   VL_RET(out);

@@ -14,7 +14,7 @@ uint32_t VLGetCharTypeEx(VLLocale *locale, const char *p, VLShiftState state, ui
   Shifted f = shiftedOf(l, state);
   const unsigned char *q = ub(p);
   if (f.isShift(*q)) f.shift(*q++);
-  uint32_t word = f.state ? vl::cp::ctypeOf(c, q, f.dbl)->type : vl::cp::sbcsType(c, *q);
+  uint32_t word = f.state ? mbType(c, q, f.dbl) : vl::cp::sbcsType(c, *q);
   uint32_t out;
   vl::setRc(l, selectType(word, selector, &out) ? VL_RC_OK : VL_RC_BADARG);
   VL_RET(out);
