@@ -3,6 +3,8 @@
 // Double-byte characters all classify as ideographs.
 #pragma once
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "support/cpmem.h"
 #include "veltrin.h"
@@ -14,11 +16,36 @@ enum Kind { kSingle, kDouble, kShift, kUtf8 };
 constexpr uint32_t kTypeA = 0x10000A13;  // the letter A
 constexpr uint32_t kIdeo = 0x40000801;
 
+// Line-end bytes and single-byte type words are patched into the body as the files
+// hold it (big-endian).
+struct Extra {
+  uint8_t lf = 0x0A, cr = 0x0D, ls = 0x1E, ps = 0x1F;
+  std::vector<std::pair<uint8_t, uint32_t>> types = {{'A', kTypeA}};
+};
+
+inline std::vector<cpmem::Bytes> sectionsOf(const cpmem::Page &p, const Extra &x) {
+  std::vector<cpmem::Bytes> s = p.sections();
+  cpmem::Bytes &b = s[0];
+  b[1] = x.lf;
+  b[2] = x.cr;
+  b[3] = x.ls;
+  b[4] = x.ps;
+  for (auto [byte, word] : x.types)
+    for (int i = 0; i < 4; ++i) b[1292 + 4 * byte + i] = static_cast<uint8_t>(word >> (24 - 8 * i));
+  return s;
+}
+
+inline Extra extraOf(Kind k) {
+  Extra x;
+  if (k == kShift) {
+    x.lf = x.ls = x.ps = 0x25;
+    x.types.push_back({0xC1, kTypeA});
+  }
+  return x;
+}
+
 inline cpmem::Page pageOf(Kind k) {
   cpmem::Page p;
-  p.type['A'] = kTypeA;
-  p.ls = 0x1E;
-  p.ps = 0x1F;
   auto tries = [&p] {
     p.typeNodes = {{0, 0x00, 1}, {1, 0xFF, 0}};
     p.records.assign(256, VLCtypeRecord{kIdeo, 0});
@@ -38,8 +65,6 @@ inline cpmem::Page pageOf(Kind k) {
       p.flags = 0x0002;
       p.so = 0x0E;
       p.si = 0x0F;
-      p.lf = p.ls = p.ps = 0x25;
-      p.type[0xC1] = kTypeA;
       tries();
       break;
     case kUtf8:
@@ -55,7 +80,7 @@ struct PageLocale {
   cpmem::Loaded page;
   VLLocale loc{};
   explicit PageLocale(Kind k)
-      : page(pageOf(k).sections(), k == kUtf8 ? VL_CP_UTF8 : k == kShift ? 930 : k == kDouble ? 932 : 819) {
+      : page(sectionsOf(pageOf(k), extraOf(k)), k == kUtf8 ? VL_CP_UTF8 : k == kShift ? 930 : k == kDouble ? 932 : 819) {
     loc.codePage = &page.entry;
     loc.flags = static_cast<uint16_t>((k == kSingle ? VL_LF_SINGLEBYTE : 0) | (k == kShift ? VL_LF_SHIFT : 0));
   }

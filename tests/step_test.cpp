@@ -322,3 +322,35 @@ TEST(Step, WritesLineEnds) {
 }
 
 }  // namespace
+
+// On the generated definitions, stepping meets the converter character for character,
+// and the code page's type words agree with the Unicode tables.
+TEST(Step, GeneratedPagesAgreeWithUnicode) {
+  if (!std::ifstream(std::string(VL_TEST_DEFS_DIR) + "/control.nls")) GTEST_SKIP() << "no generated definitions";
+  ASSERT_EQ(VLInit(VL_TEST_DEFS_DIR, nullptr, nullptr, 0, VL_OPT_NOBUILTIN), 0u);
+  const std::vector<std::pair<const char *, std::string>> cases = {
+      {"English_UnitedStates.UTF-8", B("a\xC3\xA9\xE2\x82\xAC" "1 \xE3\x81\x82")},
+      {"English_UnitedStates.MS932", B("A\x82\xA0\x82\x60\xB1" "9")},
+      {"English_UnitedStates.IBM930", B("\xC1\x0E\x40\x40\x0F\xF1")},
+      {"English_UnitedStates.Latin1", B("A\xE9\xD7" "5")},
+  };
+  for (const auto &[name, text] : cases) {
+    SCOPED_TRACE(name);
+    uint32_t rc = 0;
+    VLLocale *l = VLGetLocale(name, 0, &rc);
+    ASSERT_NE(l, nullptr) << rc;
+    VLUChar units[32];
+    int32_t n = VLCpStrToUnicode(l->codePage, reinterpret_cast<const unsigned char *>(text.data()), static_cast<int32_t>(text.size()), units);
+    EXPECT_EQ(VLNumCharsEx(l, text.data(), 0, static_cast<int32_t>(text.size())), n);
+    const char *p = text.data();
+    VLShiftState st = 0;
+    for (int32_t i = 0; i < n; ++i) {
+      for (uint32_t sel : {VL_CT_TYPE1, VL_CT_TYPE2, VL_CT_TYPE3})
+        EXPECT_EQ(VLGetCharTypeEx(l, p, st, sel), VLGetCharTypeU(l, units[i], sel)) << "unit " << std::hex << units[i];
+      p = VLNextCharEx(l, p, st, &st);
+    }
+    EXPECT_EQ(p, text.data() + text.size());
+    VLReleaseLocale(l);
+  }
+  VLTerm();
+}
