@@ -16,7 +16,7 @@ size_t unitCount(const VLUChar *u) {
 
 int32_t shifted(const VLCodePage *c, const VLUChar *u, size_t count, bool wide, uint8_t *out) {
   const uint8_t so = shiftOut(c), si = shiftIn(c);
-  size_t pos = 0, soAt = SIZE_MAX;
+  size_t pos = 0;
   for (size_t i = 0; i < count; ++i) {
     uint8_t b[4];
     int n = uniToMb(c, u[i], b);
@@ -24,19 +24,15 @@ int32_t shifted(const VLCodePage *c, const VLUChar *u, size_t count, bool wide, 
       out[pos++] = si;
       wide = false;
     } else if (n > 1 && !wide) {
-      soAt = pos;
       out[pos++] = so;
       wide = true;
     }
     for (int k = 0; k < n; ++k) out[pos++] = b[k];
   }
-  if (wide) {
-    // A Shift-Out with nothing behind it is dropped rather than closed.
-    if (pos > 0 && soAt == pos - 1)
-      --pos;
-    else
-      out[pos++] = si;
-  }
+  // Every unit writes at least one byte behind its Shift-Out, so a Shift-Out is never
+  // left last to be dropped: ending in the double-byte state always closes with Shift-In.
+  // (A trail byte that merely equals the Shift-Out byte is data, not a shift.)
+  if (wide) out[pos++] = si;
   return static_cast<int32_t>(pos);
 }
 
