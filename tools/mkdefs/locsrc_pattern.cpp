@@ -1,6 +1,6 @@
 // Rewrites strftime-style patterns into the directive set the time formatter accepts:
 // %a %A %b %B %c %d %H %I %j %m %M %p %S %U %w %W %x %X %y %Y %% and the "#" modifier
-// (no leading zeros). The mapping is documented in PATTERNS.md; keep the two in step.
+// (no leading zeros). The mapping is documented in README; keep the two in step.
 #include "locsrc_pattern.h"
 
 namespace mkdefs::locsrc {

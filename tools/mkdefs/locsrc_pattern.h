@@ -9,7 +9,7 @@ struct TimeFormats {
   std::u32string dFmt, tFmt, dtFmt, tFmtAmPm, dateFmt;
 };
 
-// One source pattern in the library's directive set (the table in PATTERNS.md); %c, %x,
+// One source pattern in the library's directive set (the table in README); %c, %x,
 // %X and %r are replaced by the locale's own patterns, so the result never refers to
 // another locale pattern.
 std::u32string translatePattern(const std::u32string &src, const TimeFormats &fmts);
