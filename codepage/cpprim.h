@@ -11,6 +11,9 @@
 
 #include "codepage/cpbody.h"
 
+// The per-character forms stay inline in every loop that uses them.
+#define VL_HOT inline __attribute__((always_inline))
+
 namespace vl::cp {
 
 constexpr VLUChar kReplacement = 0xFFFD;
@@ -22,28 +25,28 @@ inline bool usable(const VLCodePage *c) { return c && c->section[0]; }
 // ---- Lengths and W values ------------------------------------------------------------
 
 // UTF-8 by arithmetic: a stray continuation byte stands alone as one (undecodable) byte.
-inline unsigned utf8Len(uint8_t lead) { return lead < 0xC0 ? 1u : lead > 0xDF ? 3u : 2u; }
+VL_HOT unsigned utf8Len(uint8_t lead) { return lead < 0xC0 ? 1u : lead > 0xDF ? 3u : 2u; }
 
 // Length of the character starting with lead.
-inline unsigned lenOf(const VLCodePage *c, uint8_t lead) {
+VL_HOT unsigned lenOf(const VLCodePage *c, uint8_t lead) {
   return isUtf8(c) ? utf8Len(lead) : charLen(c, lead);
 }
 
 // Bytes of a character of more than one byte: in a shift-sensitive page those are the
 // characters of the double-byte state, whose length the lead-byte table does not give.
-inline unsigned multiLen(const VLCodePage *c, uint8_t lead) {
+VL_HOT unsigned multiLen(const VLCodePage *c, uint8_t lead) {
   if (isUtf8(c)) return utf8Len(lead);
   return isShift(c) ? maxLen(c) : charLen(c, lead);
 }
 
-inline VLWChar readW(const uint8_t *p, unsigned n) {
+VL_HOT VLWChar readW(const uint8_t *p, unsigned n) {
   VLWChar v = p[0];
   for (unsigned i = 1; i < n; ++i) v = (v << 8) | p[i];
   return v;
 }
 
 // Zero bytes inside a value are dropped on purpose: no character is formed with them.
-inline int wToMb(uint8_t *out, VLWChar v) {
+VL_HOT int wToMb(uint8_t *out, VLWChar v) {
   int n = 0;
   if (v > 0xFFFFFF) out[n++] = static_cast<uint8_t>(v >> 24);
   if ((v >> 16) & 0xFF) out[n++] = static_cast<uint8_t>(v >> 16);
@@ -61,7 +64,7 @@ struct WBytes {
 
 // ---- Code page to UTF-16 ---------------------------------------------------------------
 
-inline VLUChar utf8ToUni(const uint8_t *p) {
+VL_HOT VLUChar utf8ToUni(const uint8_t *p) {
   uint8_t b0 = p[0];
   if (b0 < 0x80) return b0;
   if (b0 < 0xC0) return kReplacement;
@@ -70,7 +73,7 @@ inline VLUChar utf8ToUni(const uint8_t *p) {
 }
 
 // Walks the conversion trie over at most n bytes.
-inline VLUChar trieToUni(const VLCodePage *c, const uint8_t *p, unsigned n) {
+VL_HOT VLUChar trieToUni(const VLCodePage *c, const uint8_t *p, unsigned n) {
   const uint8_t *t = trie(c);
   if (!t) return kReplacement;
   const uint8_t *node = t;
@@ -84,18 +87,18 @@ inline VLUChar trieToUni(const VLCodePage *c, const uint8_t *p, unsigned n) {
   return kReplacement;
 }
 
-inline VLUChar mbToUni(const VLCodePage *c, const uint8_t *p, unsigned n) {
+VL_HOT VLUChar mbToUni(const VLCodePage *c, const uint8_t *p, unsigned n) {
   return isUtf8(c) ? utf8ToUni(p) : trieToUni(c, p, n);
 }
 
-inline VLUChar wToUni(const VLCodePage *c, VLWChar v) {
+VL_HOT VLUChar wToUni(const VLCodePage *c, VLWChar v) {
   WBytes w(v);
   return mbToUni(c, w.b, w.n);
 }
 
 // ---- UTF-16 to code page ---------------------------------------------------------------
 
-inline int uniToUtf8(VLUChar u, uint8_t *out) {
+VL_HOT int uniToUtf8(VLUChar u, uint8_t *out) {
   if (u < 0x80) {
     out[0] = static_cast<uint8_t>(u);
     return 1;
@@ -111,20 +114,20 @@ inline int uniToUtf8(VLUChar u, uint8_t *out) {
   return 3;
 }
 
-inline VLWChar uniToUtf8W(VLUChar u) {
+VL_HOT VLWChar uniToUtf8W(VLUChar u) {
   if (u < 0x80) return u;
   if (u <= 0x7FF) return 0xC080u | ((u & 0x7C0u) << 2) | (u & 0x3Fu);
   return 0xE08080u | ((u & 0xF000u) << 4) | ((u & 0xFC0u) << 2) | (u & 0x3Fu);
 }
 
 // The index entry of the unit's high byte, or null when its low byte is out of bounds.
-inline const uint8_t *indexEntry(const VLCodePage *c, VLUChar u) {
+VL_HOT const uint8_t *indexEntry(const VLCodePage *c, VLUChar u) {
   const uint8_t *x = body(c) + kIndex + kIndexSize * (u >> 8);
   unsigned l = u & 0xFF;
   return (l < x[2] || l > x[3]) ? nullptr : x;
 }
 
-inline VLWChar indexValue(const VLCodePage *c, const uint8_t *x, VLUChar u) {
+VL_HOT VLWChar indexValue(const VLCodePage *c, const uint8_t *x, VLUChar u) {
   unsigned i = (u & 0xFF) & x[1];
   auto lo = [&] { return lowTable(c) + rd16(x + 4); };
   auto hi = [&] { return highTable(c) + rd16(x + 6); };
@@ -144,7 +147,7 @@ inline VLWChar indexValue(const VLCodePage *c, const uint8_t *x, VLUChar u) {
   }
 }
 
-inline int uniToMb(const VLCodePage *c, VLUChar u, uint8_t *out) {
+VL_HOT int uniToMb(const VLCodePage *c, VLUChar u, uint8_t *out) {
   if (isUtf8(c)) return uniToUtf8(u, out);
   const uint8_t *x = indexEntry(c, u);
   if (!x) {
@@ -158,7 +161,7 @@ inline int uniToMb(const VLCodePage *c, VLUChar u, uint8_t *out) {
   return wToMb(out, indexValue(c, x, u));
 }
 
-inline VLWChar uniToW(const VLCodePage *c, VLUChar u) {
+VL_HOT VLWChar uniToW(const VLCodePage *c, VLUChar u) {
   if (isUtf8(c)) return uniToUtf8W(u);
   const uint8_t *x = indexEntry(c, u);
   return x ? indexValue(c, x, u) : subst(c);
@@ -167,7 +170,7 @@ inline VLWChar uniToW(const VLCodePage *c, VLUChar u) {
 // ---- Types, case and width -------------------------------------------------------------
 
 // Walks the type trie over at most n bytes; the trie has no bounds, every byte leads on.
-inline const VLCtypeRecord *ctypeOf(const VLCodePage *c, const uint8_t *p, unsigned n) {
+VL_HOT const VLCtypeRecord *ctypeOf(const VLCodePage *c, const uint8_t *p, unsigned n) {
   unsigned nodes = off(c, kTypeTrieOff), records = off(c, kTypeRecOff);
   if (!nodes || !records) return &kUnassigned;
   const uint8_t *b = body(c);
@@ -180,20 +183,20 @@ inline const VLCtypeRecord *ctypeOf(const VLCodePage *c, const uint8_t *p, unsig
   return &kUnassigned;
 }
 
-inline const VLCtypeRecord *ctypeOfW(const VLCodePage *c, VLWChar v) {
+VL_HOT const VLCtypeRecord *ctypeOfW(const VLCodePage *c, VLWChar v) {
   WBytes w(v);
   return ctypeOf(c, w.b, w.n);
 }
 
 // Converts the n-byte character at src when its type matches mask, else copies it.
-inline int caseConv(const VLCodePage *c, const uint8_t *src, unsigned n, uint8_t *out, uint32_t mask) {
+VL_HOT int caseConv(const VLCodePage *c, const uint8_t *src, unsigned n, uint8_t *out, uint32_t mask) {
   const VLCtypeRecord *r = ctypeOf(c, src, n);
   if (r->type & mask) return wToMb(out, readW(src, n) + static_cast<VLWChar>(r->caseDelta));
   std::memcpy(out, src, n);
   return static_cast<int>(n);
 }
 
-inline VLWChar caseConvW(const VLCodePage *c, VLWChar v, uint32_t mask) {
+VL_HOT VLWChar caseConvW(const VLCodePage *c, VLWChar v, uint32_t mask) {
   const VLCtypeRecord *r = ctypeOfW(c, v);
   return (r->type & mask) ? v + static_cast<VLWChar>(r->caseDelta) : v;
 }

@@ -44,6 +44,12 @@ int32_t utf8(const uint8_t *s, size_t rem, VLUChar *out) {
 }
 
 int32_t plain(const VLCodePage *c, const uint8_t *s, size_t rem, VLUChar *out) {
+  if (maxLen(c) == 1) {  // every character is one byte: the table alone
+    const uint8_t *uni = body(c) + kSbcsUni;
+    size_t i = 0;
+    for (; i < rem && s[i]; ++i) out[i] = vl::rd16(uni + 2u * s[i]);
+    return static_cast<int32_t>(i);
+  }
   int32_t n = 0;
   while (rem >= 1 && *s) {
     unsigned len = charLen(c, *s);

@@ -45,7 +45,24 @@ int32_t VLCpUnicodeToStr(const VLCodePage *cp, const VLUChar *u, int32_t length,
   size_t count = length < 0 ? unitCount(u) : static_cast<size_t>(length);
   if (!isUtf8(cp) && isShift(cp)) VL_RET(shifted(cp, u, count, state != 0, out));
   size_t pos = 0;
-  for (size_t i = 0; i < count && u[i]; ++i) pos += static_cast<size_t>(uniToMb(cp, u[i], out + pos));
+  if (isUtf8(cp)) {
+    for (size_t i = 0; i < count && u[i]; ++i) pos += static_cast<size_t>(uniToUtf8(u[i], out + pos));
+  } else {
+    // The tables are held in locals: every byte stored through out may alias the record.
+    const uint8_t *index = body(cp) + kIndex, *low = lowTable(cp);
+    const uint8_t sub = subst(cp);
+    for (size_t i = 0; i < count && u[i]; ++i) {
+      const VLUChar c = u[i];
+      const uint8_t *x = index + kIndexSize * (c >> 8);
+      const unsigned l = c & 0xFF;
+      if (l < x[2] || l > x[3])
+        out[pos++] = sub;
+      else if (x[0] == 0)
+        out[pos++] = low[vl::rd16(x + 4) + (l & x[1])];
+      else
+        pos += static_cast<size_t>(wToMb(out + pos, indexValue(cp, x, c)));
+    }
+  }
   out[pos] = 0;
   VL_RET(static_cast<int32_t>(pos));
 }
