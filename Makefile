@@ -36,7 +36,7 @@ demo: build
 
 test: build asan
 	cd $(BUILD) && ctest --output-on-failure
-	cd $(ASAN_BUILD) && ASAN_OPTIONS=detect_leaks=1 UBSAN_OPTIONS=print_stacktrace=1 ctest --output-on-failure
+	cd $(ASAN_BUILD) && ASAN_OPTIONS=detect_leaks=1 LSAN_OPTIONS=suppressions=$(CURDIR)/tests/lsan.supp UBSAN_OPTIONS=print_stacktrace=1 ctest --output-on-failure
 
 bench: build
 	$(BUILD)/tlx_bench

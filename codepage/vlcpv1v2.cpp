@@ -96,8 +96,10 @@ void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, uint32_t
   }
   uint8_t *b = out.get();
   std::memcpy(b, v1, cp::kShiftOut);
-  b[cp::kShiftOut] = 0;
-  b[cp::kShiftIn] = 0;
+  // The first generation has no shift bytes: a shift-sensitive page takes the usual ones.
+  bool shifted = (vl::be16(v1 + kV1Flags) & cp::kFlagShift) != 0;
+  b[cp::kShiftOut] = shifted ? 0x0E : 0;
+  b[cp::kShiftIn] = shifted ? 0x0F : 0;
   std::memcpy(b + cp::kLenTable, v1 + cp::kShiftOut, kV1Flags - cp::kShiftOut);
   std::memcpy(b + cp::kFlags, v1 + kV1Flags, 2);
   std::memset(b + cp::kFullOff, 0, cp::kHeader - cp::kFullOff);

@@ -133,7 +133,7 @@ uint32_t checkCodePage(VLObjEntry *e) {
     uint8_t l = b[cp::kLenTable + i];
     if (l < 1 || l > 4 || (!shift && l > maxLen)) return kBad;
   }
-  if (shift && maxLen < 2) return kBad;
+  if (shift && (maxLen < 2 || b[cp::kShiftOut] == b[cp::kShiftIn])) return kBad;
 
   // Variable tables: each runs to the next table's start or the end of the body.
   const uint32_t at[4] = {cp::kFullOff, cp::kPairOff, cp::kTypeTrieOff, cp::kTypeRecOff};

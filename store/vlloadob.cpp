@@ -45,6 +45,7 @@ uint32_t readObject(VLObjManager *m, VLObjEntry *e, Loaded *out) {
     out->size[i] = h.size[i];
   }
   if (e->type == VL_OBJ_CODEPAGE && vl::store::generation(h) == 1) {
+    if (out->size[0] < vl::cp::kV1Header) return VL_RC_BADMAGIC;
     void *trie = nullptr;
     void *body = VLCpV1toV2(out->section[0], out->size[0], out->section[1], out->size[1], &trie, e);
     if (!body) return VL_RC_NOMEM;
