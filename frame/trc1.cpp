@@ -29,11 +29,11 @@ pthread_mutex_t g_mutex = PTHREAD_MUTEX_INITIALIZER;
 Config g_config;
 bool g_loaded = false;
 
-void parseFlags(Config &c, const char *spec) {
+void parseFlags(Config &c, const char *text) {
   c.count = 0;
   c.all = 0;
-  if (!spec) return;
-  const char *p = spec;
+  if (!text) return;
+  const char *p = text;
   while (*p) {
     const char *end = std::strchr(p, ',');
     size_t n = end ? static_cast<size_t>(end - p) : std::strlen(p);

@@ -76,16 +76,12 @@ Part part(const Char *&p, Char sep, const char *stops, bool fallback, uint16_t t
     p += s.n;
     if (s.n > 0) {
       VLObjEntry *e = lookup(s, &rc);
-      if (e && e->type != type) e = nullptr, rc = VL_RC_NOTFOUND;
       if (e || (rc == 0 && type == VL_OBJ_SORT)) return {e, 0};
       if (!(rc == VL_RC_NOTFOUND && fallback)) return {nullptr, lookupFailure(rc, notFound)};
     }
   }
   rc = 0;
-  VLObjEntry *e = VLGetObjFromID(m, type, defaultId, 0, &rc);
-  // The id search may answer with the last object of the type before when this type has
-  // none: such an object is not the one asked for.
-  if (e && e->type != type) e = nullptr, rc = VL_RC_NOTFOUND;
+  VLObjEntry *e = store::objById(m, type, defaultId, 0, &rc);
   if (e || (rc == 0 && type == VL_OBJ_SORT)) return {e, 0};
   return {nullptr, lookupFailure(rc, notFound)};
 }

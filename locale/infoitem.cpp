@@ -1,6 +1,7 @@
 // Where each information item is kept, and the composed locale name.
 #include <cstdio>
 
+#include "store/store.h"
 #include "locale/info.h"
 
 namespace {
@@ -12,7 +13,7 @@ const VLUChar kNoText[1] = {0};
 const char *defaultName(const VLObjEntry *lang, int type, int word) {
   VLObjManager *m = vlglobals ? vlglobals->objManager : nullptr;
   uint32_t rc = 0;
-  const VLObjEntry *e = VLGetObjFromID(m, static_cast<uint16_t>(type), vl::loc::word(lang, word), 1, &rc);
+  const VLObjEntry *e = vl::store::objById(m, static_cast<uint16_t>(type), vl::loc::word(lang, word), 1, &rc);
   if (e) return e->name;
   return type == VL_OBJ_SORT ? kBinary : nullptr;
 }
@@ -22,7 +23,7 @@ const char *defaultName(const VLObjEntry *lang, int type, int word) {
 const VLCodePage *vl::info::asciiPage() {
   VLObjManager *m = vlglobals ? vlglobals->objManager : nullptr;
   uint32_t rc = 0;
-  return VLGetObjFromID(m, VL_OBJ_CODEPAGE, VL_CP_ASCII, 0, &rc);
+  return vl::store::objById(m, VL_OBJ_CODEPAGE, VL_CP_ASCII, 0, &rc);
 }
 
 bool vl::info::locate(const VLLocale *l, int32_t item, bool current, bool utf16, Item *out) {

@@ -1,4 +1,5 @@
 // Sets a numeric information item, or swaps an object of the locale by id.
+#include "store/store.h"
 #include "locale/info.h"
 
 VL_TRACE_MODULE("vlsetnum");
@@ -12,7 +13,7 @@ uint32_t setNum(VLLocale *l, int32_t item, uint16_t v) {
       int type = vl::info::objectType(item);
       if (type == VL_OBJ_SORT && v == 0) return vl::info::applyObject(l, type, nullptr);
       uint32_t rc = 0;
-      VLObjEntry *e = VLGetObjFromID(vlglobals ? vlglobals->objManager : nullptr, static_cast<uint16_t>(type), v, 0, &rc);
+      VLObjEntry *e = vl::store::objById(vlglobals ? vlglobals->objManager : nullptr, static_cast<uint16_t>(type), v, 0, &rc);
       return e ? vl::info::applyObject(l, type, e) : vl::info::lookupRc(rc);
     }
     case 63: case 69: case 70: {

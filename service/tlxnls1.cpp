@@ -4,6 +4,7 @@
 #include <clocale>
 #include <cstdio>
 
+#include "store/store.h"
 #include "locale/locale.h"
 #include "service/service.h"
 
@@ -59,11 +60,11 @@ VLObjManager *manager() { return vlglobals ? vlglobals->objManager : nullptr; }
 
 // ---- Locale names from ids ----------------------------------------------------------------
 
-// Appends sep and the name of object (type, id) to out; the Part's codes on failure.
+// Appends sep and the name of object (type, id) to out; 30, 31 or 34 when there is none.
 uint32_t appendObject(char *out, size_t size, int type, uint16_t id, const char *sep, uint32_t notFound,
                       const char *what) {
   uint32_t rc = 0;
-  VLObjEntry *e = VLGetObjFromID(manager(), static_cast<uint16_t>(type), id, 1, &rc);
+  VLObjEntry *e = vl::store::objById(manager(), static_cast<uint16_t>(type), id, 1, &rc);
   if (!e) {
     VL_ERR("Invalid %s %d", what, static_cast<int>(id));
     return notFound;
@@ -290,7 +291,7 @@ int NLS1_SetLocaleNumInfo(VLLocale *locale, int32_t item, int32_t value, uint32_
   // The code page goes in by name, so that an alias-aware setter does the change.
   uint32_t rc = 0;
   VLObjEntry *cp = value > 0 && value <= 0xFFFF
-                       ? VLGetObjFromID(manager(), VL_OBJ_CODEPAGE, static_cast<uint16_t>(value), 1, &rc)
+                       ? vl::store::objById(manager(), VL_OBJ_CODEPAGE, static_cast<uint16_t>(value), 1, &rc)
                        : nullptr;
   if (!cp) {
     VL_ERR("Invalid Codepage %d", static_cast<int>(value));
@@ -355,7 +356,7 @@ uint32_t NLS1_GetObjectName(uint32_t id, char *out, int32_t outSize, int type) {
   if (!vl::svc::ready()) VL_RET(VL_RC_OPEN);
   if (!out || outSize < 0 || type < 0 || type > 3 || id > 0xFFFF) VL_RET(VL_RC_BADARG);
   uint32_t rc = 0;
-  VLObjEntry *e = VLGetObjFromID(manager(), static_cast<uint16_t>(type), static_cast<uint16_t>(id), 1, &rc);
+  VLObjEntry *e = vl::store::objById(manager(), static_cast<uint16_t>(type), static_cast<uint16_t>(id), 1, &rc);
   if (!e) VL_RET(rc ? rc : VL_RC_NOTFOUND);
   size_t n = strnlen(e->name, sizeof e->name);
   if (n >= static_cast<size_t>(outSize)) {

@@ -3,6 +3,7 @@
 // lenient truncation of trailing spaces.
 #include <cstdint>
 
+#include "store/store.h"
 #include "codepage/cpbody.h"
 #include "service/service.h"
 
@@ -163,7 +164,7 @@ uint32_t classify(uint32_t id, Side *side, const char *which, uint32_t *fileRc) 
   if (id == kUtf16) return 0;
   uint32_t lrc = 0;
   VLObjManager *m = vlglobals ? vlglobals->objManager : nullptr;
-  VLObjEntry *e = id <= 0xFFFF ? VLGetObjFromID(m, VL_OBJ_CODEPAGE, static_cast<uint16_t>(id), 0, &lrc) : nullptr;
+  VLObjEntry *e = id <= 0xFFFF ? vl::store::objById(m, VL_OBJ_CODEPAGE, static_cast<uint16_t>(id), 0, &lrc) : nullptr;
   if (!e || !vl::cp::body(e)) {
     VL_ERR("Unable to locate codepage %d", static_cast<int>(id));
     if (lrc == VL_RC_FILE_MISSING) return VL_RC_NOCODEPAGE;

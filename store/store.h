@@ -52,6 +52,17 @@ inline uint32_t generation(const Header &h) { return h.version >> 28; }
 // 20 when scratch memory could not be had.
 uint32_t checkObject(VLObjEntry *entry);
 
+// VLGetObjFromID without its one surprise: when a type has no objects, the id search may
+// answer with the last object of the type before; that object is refused here.
+inline VLObjEntry *objById(VLObjManager *m, uint16_t type, uint16_t id, int noLoad, uint32_t *rc) {
+  VLObjEntry *e = VLGetObjFromID(m, type, id, noLoad, rc);
+  if (e && e->type != type) {
+    *rc = VL_RC_NOTFOUND;
+    return nullptr;
+  }
+  return e;
+}
+
 // The built-in table rows.
 extern const VLObjEntry kBuiltinEntries[3];
 

@@ -321,12 +321,12 @@ Bytes le16(const std::u16string &s) {
 }
 
 // Every code page of the alias file with the first of its names that iconv knows.
-struct Spec {
+struct Page {
   std::string name, iconvName;
   uint16_t id;
 };
-std::vector<Spec> generatedPages() {
-  std::vector<Spec> out;
+std::vector<Page> generatedPages() {
+  std::vector<Page> out;
   std::ifstream in(std::string(VL_TEST_DEFS_DIR) + "/alias.txt");
   std::vector<std::vector<std::string>> lines;
   for (std::string line; std::getline(in, line);) {
@@ -355,12 +355,12 @@ std::vector<Spec> generatedPages() {
 TEST_F(ConvertGenerated, ToolAgreesWithIconvOnEveryCodePage) {
   ts::TempDir tmp;
   std::mt19937 rng(1234);
-  std::vector<Spec> pages = generatedPages();
+  std::vector<Page> pages = generatedPages();
   EXPECT_GT(pages.size(), 30u);
-  for (const Spec &spec : pages) {
-    SCOPED_TRACE(spec.name);
+  for (const Page &page : pages) {
+    SCOPED_TRACE(page.name);
     uint32_t rc;
-    VLObjEntry *e = VLGetObjFromID(vlglobals->objManager, VL_OBJ_CODEPAGE, spec.id, 0, &rc);
+    VLObjEntry *e = VLGetObjFromID(vlglobals->objManager, VL_OBJ_CODEPAGE, page.id, 0, &rc);
     ASSERT_NE(e, nullptr);
     VLLocale loc{};
     loc.codePage = e;
@@ -378,8 +378,8 @@ TEST_F(ConvertGenerated, ToolAgreesWithIconvOnEveryCodePage) {
       VLUChar back[4];
       if (n < 2 || VLStringToUnicodeEx(back, 4, &loc, mine, 0, n - 1, 0) != 1 || back[0] != u) continue;
       Bytes theirs, again;
-      if (!viaIconv(spec.iconvName.c_str(), "UTF-16LE", le16(std::u16string(1, static_cast<char16_t>(u))), &theirs) ||
-          !viaIconv("UTF-16LE", spec.iconvName.c_str(), theirs, &again) || again != le16(std::u16string(1, char16_t(u))))
+      if (!viaIconv(page.iconvName.c_str(), "UTF-16LE", le16(std::u16string(1, static_cast<char16_t>(u))), &theirs) ||
+          !viaIconv("UTF-16LE", page.iconvName.c_str(), theirs, &again) || again != le16(std::u16string(1, char16_t(u))))
         continue;
       if (theirs != Bytes(mine, static_cast<size_t>(n - 1))) {
         if (!disagree++) firstDisagreement = "U+" + std::to_string(u) + ": " + hex(mine) + "vs " + hex(theirs);
@@ -398,13 +398,13 @@ TEST_F(ConvertGenerated, ToolAgreesWithIconvOnEveryCodePage) {
       for (size_t k = run(rng); k--;) text += c < 0x80 ? shared[pick(rng) % 64] : c;
     }
     Bytes u16 = le16(text), cpBytes;
-    ASSERT_TRUE(viaIconv(spec.iconvName.c_str(), "UTF-16LE", u16, &cpBytes));
+    ASSERT_TRUE(viaIconv(page.iconvName.c_str(), "UTF-16LE", u16, &cpBytes));
     std::string u16Path = tmp.file("in16"), cpPath = tmp.file("incp");
     std::ofstream(u16Path, std::ios::binary) << u16;
     std::ofstream(cpPath, std::ios::binary) << cpBytes;
-    std::string id = std::to_string(spec.id);
+    std::string id = std::to_string(page.id);
     EXPECT_EQ(hex(runTool("-f UTF-16LE -t " + id, u16Path)), hex(cpBytes));
-    EXPECT_EQ(runTool("-f " + spec.name + " -t UTF-16LE", cpPath) == u16, true);
+    EXPECT_EQ(runTool("-f " + page.name + " -t UTF-16LE", cpPath) == u16, true);
     // The one-shot members over the whole text: long runs take the loop's bulk paths.
     std::vector<VLUChar> units(text.size() + 1);
     ASSERT_EQ(VLStringToUnicodeEx(units.data(), static_cast<int32_t>(units.size()), &loc, cpBytes.data(), 0,
@@ -420,10 +420,10 @@ TEST_F(ConvertGenerated, ToolAgreesWithIconvOnEveryCodePage) {
     // A unit the page lacks, inside a run of plain ones, still becomes the substitution byte
     // (UTF-8 lacks none).
     std::u16string plain(40, u'a');
-    plain[21] = spec.id == VL_CP_UTF8 ? u'b' : u'\uFFFD';
+    plain[21] = page.id == VL_CP_UTF8 ? u'b' : u'\uFFFD';
     char sub[48];
     ASSERT_EQ(VLUnicodeToString(&loc, sub, 48, reinterpret_cast<const VLUChar *>(plain.data()), 40, 0), 40);
-    EXPECT_EQ(static_cast<uint8_t>(sub[21]), spec.id == VL_CP_UTF8 ? 'b' : vl::cp::subst(e));
+    EXPECT_EQ(static_cast<uint8_t>(sub[21]), page.id == VL_CP_UTF8 ? 'b' : vl::cp::subst(e));
     EXPECT_EQ(sub[20], sub[22]);
     // Split reads: the engine, code page to code page, in every chunk size.
     uint32_t rc2;
