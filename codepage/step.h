@@ -266,6 +266,24 @@ inline uint32_t eolSearchKinds(uint32_t opts) {
   return opts;
 }
 
+// The byte forms of the line-end search: characters to bytes, the option word, the walk.
+template <class F>
+char *getEolBytes(VLLocale *l, F f, const char *s, int32_t length, uint32_t *kind, int32_t *eolLength,
+                  uint32_t options, uint32_t *stateOut = nullptr) {
+  if ((options & VL_OPT_CHARLEN) && length > 0 && s) {
+    length = static_cast<int32_t>(unitsOf(f, ub(s), static_cast<uint32_t>(length)));
+    options &= ~VL_OPT_CHARLEN;
+  }
+  uint32_t kinds = eolSearchKinds(options);
+  if (!kinds) {
+    eolRefused(l, kind, eolLength);
+    return nullptr;
+  }
+  setRc(l, VL_RC_OK);
+  uint32_t n = s ? resolveLen(ub(s), length) : 0;
+  return cb(findEol(f, ub(s), n, kinds, eolOf(l->codePage), kind, eolLength, stateOut));
+}
+
 // Writes the line ends of the option word in the given order (the last entry stands
 // for the carriage return of CRLF); a line feed follows for CRLF or the default.
 template <class T>

@@ -230,4 +230,16 @@ U<F> *tokenize(F f, F delimF, U<F> *str, int32_t *lenIO, const U<F> *delims, int
   return token;
 }
 
+// The byte span members: the option word, then one walk over the two strings' forms.
+template <bool In, class F>
+int32_t spanEntry(VLLocale *l, F strF, const char *str, int32_t len, F setF, const char *set, int32_t setLen,
+                  uint32_t options) {
+  if (options & ~VL_OPT_CHARLEN) {
+    setRc(l, VL_RC_BADARG);
+    return -1;
+  }
+  setRc(l, VL_RC_OK);
+  return spanOf<In>(strF, ub(str), len, setF, ub(set), setLen, options != 0);
+}
+
 }  // namespace vl::str

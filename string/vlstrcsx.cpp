@@ -11,10 +11,5 @@ int32_t VLStrcspnEx(VLLocale *locale, const char *str, VLShiftState strState, in
   VLLocale *l = use(locale);
   if (!l) VL_RET(int32_t{0});
   if (!isShifted(l)) VL_RET(VLStrcspn(l, str, len, set, setLen, options));
-  if (options & ~VL_OPT_CHARLEN) {
-    vl::setRc(l, VL_RC_BADARG);
-    VL_RET(int32_t{-1});
-  }
-  vl::setRc(l, VL_RC_OK);
-  VL_RET(spanOf<false>(shiftedOf(l, strState), ub(str), len, shiftedOf(l, setState), ub(set), setLen, options != 0));
+  VL_RET(spanEntry<false>(l, shiftedOf(l, strState), str, len, shiftedOf(l, setState), set, setLen, options));
 }

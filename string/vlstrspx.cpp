@@ -11,10 +11,5 @@ int32_t VLStrspnEx(VLLocale *locale, const char *str, VLShiftState strState, int
   VLLocale *l = use(locale);
   if (!l) VL_RET(int32_t{0});
   if (!isShifted(l)) VL_RET(VLStrspn(l, str, len, set, setLen, options));
-  if (options & ~VL_OPT_CHARLEN) {
-    vl::setRc(l, VL_RC_BADARG);
-    VL_RET(int32_t{-1});
-  }
-  vl::setRc(l, VL_RC_OK);
-  VL_RET(spanOf<true>(shiftedOf(l, strState), ub(str), len, shiftedOf(l, setState), ub(set), setLen, options != 0));
+  VL_RET(spanEntry<true>(l, shiftedOf(l, strState), str, len, shiftedOf(l, setState), set, setLen, options));
 }
