@@ -3,8 +3,10 @@ BUILD      ?= build
 ASAN_BUILD ?= build-asan
 TSAN_BUILD ?= build-tsan
 JOBS       ?= $(shell nproc)
+PREFIX     ?= /usr/local
+DESTDIR    ?=
 
-.PHONY: all setup build asan tsan demo test bench clean
+.PHONY: all setup build asan tsan demo test bench install deb clean
 
 all: build
 
@@ -40,6 +42,15 @@ test: build asan
 
 bench: build
 	$(BUILD)/tlx_bench
+
+# The library, headers, tool, pkg-config and CMake package files and the definitions,
+# under $(DESTDIR)$(PREFIX); the built-in definitions location is linked to them.
+install: build
+	DESTDIR="$(DESTDIR)" cmake --install $(BUILD) --prefix $(PREFIX)
+
+# A Debian package of the same tree (prefix /usr).
+deb: build
+	cd $(BUILD) && cpack -G DEB
 
 clean:
 	rm -rf $(BUILD) $(ASAN_BUILD) $(TSAN_BUILD)
