@@ -24,7 +24,7 @@ uint32_t spill(VLConversion *h, W &w, Value v) {
 template <class R>
 uint32_t hold(VLConversion *h, R &r) {
   size_t n = static_cast<size_t>(r.end - r.p);
-  std::memcpy(h->pendingIn + h->pendingInCount, r.p, n);
+  if (n) std::memcpy(h->pendingIn + h->pendingInCount, r.p, n);  // r.p may be null when n is 0
   h->pendingInCount = static_cast<uint8_t>(h->pendingInCount + n);
   r.p = r.end;
   return VL_RC_CNV_PARTIAL;
@@ -37,7 +37,7 @@ uint32_t run(VLConversion *h, R &r, W &w) {
     unsigned held = h->pendingInCount;
     unsigned need = std::max(r.need(h->pendingIn[0]), held);
     if (static_cast<size_t>(r.end - r.p) < need - held) return hold(h, r);
-    std::memcpy(h->pendingIn + held, r.p, need - held);
+    if (need > held) std::memcpy(h->pendingIn + held, r.p, need - held);
     r.p += need - held;
     h->pendingInCount = 0;
     Value v = r.decode(h->pendingIn, need);

@@ -3,7 +3,7 @@
 set -euo pipefail
 need=()
 have_pkg() { dpkg-query -W -f='${Status}' "$1" 2>/dev/null | grep -q 'install ok installed'; }
-for p in cmake g++ make ccache pkg-config libgtest-dev libbenchmark-dev libicu-dev unicode-data locales; do
+for p in cmake g++ clang libclang-rt-14-dev make ccache pkg-config libgtest-dev libbenchmark-dev libicu-dev unicode-data locales; do
   have_pkg "$p" || need+=("$p")
 done
 [ ${#need[@]} -eq 0 ] && exit 0

@@ -367,13 +367,12 @@ void buildIndex(const std::map<uint16_t, uint32_t> &fromW, uint8_t subst, Bytes 
     r.w.resize(static_cast<size_t>(r.hi - r.lo) + 1, subst);
     r.w[l - r.lo] = w;
   }
-  size_t lowSize = 0, highSize = 0;
+  size_t lowSize = 0;
   for (IndexRow &r : rows) {
     if (r.w.empty()) continue;
     const uint32_t top = *std::max_element(r.w.begin(), r.w.end());
     r.kind = top <= 0xFF ? 0 : top <= 0xFFFF ? 1 : top <= 0xFFFFFF ? 2 : 3;
     lowSize += r.n() * lowWidth(r.kind);
-    highSize += r.n() * highWidth(r.kind);
   }
   // 16-bit rows move their high bytes to the high table (kind 4) while the low table is
   // too full, largest rows first.
@@ -385,7 +384,6 @@ void buildIndex(const std::map<uint16_t, uint32_t> &fromW, uint8_t subst, Bytes 
     if (!best) break;
     best->kind = 4;
     lowSize -= best->n();
-    highSize += best->n();
   }
   // 16-bit slots come first in each table and 8-bit ones after them, so that a loader
   // converting 16-bit slots to its byte order never touches an 8-bit table.
