@@ -343,4 +343,47 @@ TEST_F(Catalog, PathTemplatesAndTheEnvironment) {
   VLReleaseLocale(l);
 }
 
+std::string run(const std::string &cmd, int *status) {
+  std::string out;
+  FILE *p = popen((cmd + " 2>&1").c_str(), "r");
+  char buf[512];
+  for (size_t n; (n = fread(buf, 1, sizeof buf, p)) > 0;) out.append(buf, n);
+  int st = pclose(p);
+  *status = WIFEXITED(st) ? WEXITSTATUS(st) : -1;
+  return out;
+}
+
+TEST(GencatTool, MergesNamesErrorsAndListsWhatCompilesBack) {
+  if (!haveDefs()) GTEST_SKIP();
+  ts::TempDir dir;
+  const std::string tlx = std::string(VL_TEST_TLX), defs = std::string(" --dir ") + VL_TEST_DEFS_DIR;
+  const std::string gen = tlx + " gencat" + defs + " --locale English_UnitedStates.UTF-8 ";
+  writeFile(dir.file("a.msg"), "1 one\n$set 2\n1 two-one\n$unknown x\n");
+  writeFile(dir.file("b.msg"), "$set 2\n1 again\n7 seven\n");
+  writeFile(dir.file("c.msg"), "$set 2\n1 replaced\n$set 9\n3 \"\\\\ back\\nslash\\001\n");
+  const std::string cat = dir.file("o.cat");
+  int st;
+  std::string err = run(gen + cat + " " + dir.file("a.msg") + " " + dir.file("b.msg"), &st);
+  EXPECT_EQ(st, 1) << "a message defined twice is a data error";
+  EXPECT_NE(err.find("b.msg:2: duplicated message number"), std::string::npos) << err;
+  EXPECT_NE(err.find("a.msg:3: this is the first definition"), std::string::npos) << err;
+  EXPECT_NE(err.find("a.msg:4: unknown directive"), std::string::npos) << err;
+  // The existing catalog is merged; a later source replaces its messages quietly.
+  err = run(gen + cat + " " + dir.file("c.msg"), &st);
+  EXPECT_EQ(st, 0) << err;
+  const std::string listing = run(tlx + " catalog" + defs + " " + cat, &st);
+  EXPECT_EQ(st, 0);
+  EXPECT_EQ(listing, "$set 1\n1 one\n$set 2\n1 replaced\n7 seven\n$set 9\n3 \"\\\\ back\\nslash\\001\n");
+  writeFile(dir.file("listed.msg"), listing);
+  run(gen + dir.file("again.cat") + " " + dir.file("listed.msg"), &st);
+  EXPECT_EQ(st, 0);
+  EXPECT_EQ(run(tlx + " catalog" + defs + " " + dir.file("again.cat"), &st), listing) << "the listing compiles back";
+  writeFile(dir.file("not.cat"), "junk");
+  err = run(gen + dir.file("not.cat") + " " + dir.file("a.msg"), &st);
+  EXPECT_EQ(st, 1);
+  EXPECT_NE(err.find("not overwritten"), std::string::npos) << err;
+  const auto kept = ts::readFile(dir.file("not.cat"));
+  EXPECT_EQ(std::string(kept.begin(), kept.end()), "junk");
+}
+
 }  // namespace
