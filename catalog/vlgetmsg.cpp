@@ -12,12 +12,30 @@ uint32_t VLGetMessage(VLCatalog *catalog, uint32_t set, uint32_t message, char *
   vl::setRc(l, VL_RC_OK);
   if (length <= 0) VL_RET(uint32_t{0});
   VLMcSet record;
-  VLMcSet *s = MCGetSet(catalog, set, &record);
-  char *text = s ? MCGetMsg(catalog, s, message) : nullptr;
+  const char *text = nullptr;
+  size_t n = 0;
+  if (catalog->inMemory) {  // the loaded copies, searched in place
+    const VLMcSet *s = bounded(catalog->sets, catalog->setCount, set);
+    const VLMcMsg *m = s ? bounded(s->index, s->count, message) : nullptr;
+    if (m) text = m->text, n = m->length;
+  } else if (VLMcSet *s = MCGetSet(catalog, set, &record)) {
+    if ((text = MCGetMsg(catalog, s, message))) n = std::strlen(text);
+  }
   if (text) {
-    VLConvertStringEx(l, buffer, 0, length, catalog->catLocale, text, 0, static_cast<int32_t>(std::strlen(text)),
-                      VL_OPT_NULLTERM);
-    if (!catalog->inMemory) vl::release(text);
+    const VLLocale *from = catalog->catLocale;
+    // The same code page needs no conversion; a cut still falls on a character boundary,
+    // and only a shift run would need closing.
+    if (from && from->codePage == l->codePage && !vl::step::isShifted(l)) {
+      if (n < static_cast<size_t>(length)) {
+        std::memcpy(buffer, text, n + 1);
+      } else {
+        int32_t k = VLStrcpy(l, buffer, length - 1, text, static_cast<int32_t>(n), 0);
+        buffer[k > 0 ? k : 0] = 0;
+      }
+    } else {
+      VLConvertStringEx(l, buffer, 0, length, catalog->catLocale, text, 0, static_cast<int32_t>(n), VL_OPT_NULLTERM);
+    }
+    if (!catalog->inMemory) vl::release(const_cast<char *>(text));
     VL_RET(fail(l, VL_RC_OK));
   }
   // A damaged catalog keeps its code in the handle even when a default stands in.

@@ -35,7 +35,9 @@ VLMcSet *VLMcLoadSet(VLCatalog *catalog, VLMcSet *set) {
       VL_RET(static_cast<VLMcSet *>(nullptr));
     }
     last = number;
-    index.get()[i] = VLMcMsg{number, length, text.get() + at};
+    // The length a caller sees: up to the first 0, as the text is used as a C string.
+    const char *t = text.get() + at;
+    index.get()[i] = VLMcMsg{number, static_cast<uint32_t>(strnlen(t, length)), t};
   }
   set->text = text.take();
   set->index = index.take();

@@ -27,7 +27,7 @@ extern "C" {
 /* One message of a set loaded into memory. */
 typedef struct VLMcMsg {
   uint32_t number;
-  uint32_t length;
+  uint32_t length;       /* bytes before the first 0 */
   const char *text;      /* 0-terminated, inside the set's text copy */
 } VLMcMsg;
 
