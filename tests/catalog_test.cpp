@@ -128,6 +128,23 @@ TEST_F(Catalog, EveryDirectiveReadBackInBothModesIntoOtherCodePages) {
         while (u[n]) ++n;
         EXPECT_EQ(iconvTo("UTF-8", Bytes(reinterpret_cast<char *>(u), 2 * n), "UTF-16LE"), text) << p.name;
       }
+      // The Japanese catalogs read by a caller in the other Japanese code page.
+      const char *other = std::string(p.name) == "MS932" ? "Japanese_Japan.IBM930"
+                          : std::string(p.name) == "IBM930" ? "Japanese_Japan.MS932" : nullptr;
+      if (other) {
+        VLLocale *o = locale(other);
+        VLCatalog *oc = VLOpenCatalog(o, dir.path.c_str(), cat.c_str(), mode);
+        ASSERT_NE(oc, nullptr);
+        for (const auto &[key, text] : expected(p.word)) {
+          VLUChar u[64];
+          EXPECT_EQ(VLGetMessageU(oc, key.first, key.second, u, 64, nullptr, 0), 0u);
+          size_t n = 0;
+          while (u[n]) ++n;
+          EXPECT_EQ(iconvTo("UTF-8", Bytes(reinterpret_cast<char *>(u), 2 * n), "UTF-16LE"), text) << p.name << " via " << other;
+        }
+        VLCloseCatalog(oc);
+        VLReleaseLocale(o);
+      }
       char buf[16];
       EXPECT_EQ(VLGetMessage(c, 3, 2, buf, sizeof buf, nullptr, 0), 72u) << "deleted set";
       EXPECT_EQ(VLGetMessage(c, 1, 5, buf, sizeof buf, "fallback", 0), 0u);
@@ -335,6 +352,24 @@ TEST_F(Catalog, PathTemplatesAndTheEnvironment) {
     }
     VLCloseCatalog(cat);
   }
+  // A second pass substitutes the default locale's codes, unless one pass is asked for.
+  uint32_t rc;
+  VLLocale *def = VLGetLocale("", VL_LOCALE_FALLBACK, &rc);
+  ASSERT_NE(def, nullptr);
+  VLGetLocaleTextInfo(def, 3, lang, 7, 0);
+  VLGetLocaleTextInfo(def, 7, terr, 7, 0);
+  VLReleaseLocale(def);
+  VLLocale *ja = locale("Japanese_Japan.MS932");
+  const std::string defName = std::string(lang) + "_" + terr;
+  if (defName != "ja_JP") {
+    writeFile(dir.file(defName + ".msgs"), build({{1, {1}}}).file);
+    const std::string tmpl = dir.path + "/%L.msgs";
+    EXPECT_EQ(VLOpenCatalog(ja, tmpl.c_str(), "x", VL_CAT_ONEPASS), nullptr);
+    VLCatalog *two = VLOpenCatalog(ja, tmpl.c_str(), "x", 0);
+    EXPECT_NE(two, nullptr) << "second pass with " << defName;
+    VLCloseCatalog(two);
+  }
+  VLReleaseLocale(ja);
   EXPECT_EQ(VLOpenCatalog(l, nullptr, "", 0), nullptr);
   EXPECT_EQ(VLGetError(l), 2);
   EXPECT_EQ(VLOpenCatalog(l, nullptr, "x", 0x80000062u), nullptr);
