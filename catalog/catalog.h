@@ -153,7 +153,10 @@ uint32_t getWide(VLCatalog *c, uint32_t set, uint32_t message, T *buffer, int32_
                  uint32_t unused) {
   VLLocale *l = reportTo(c);
   if (!c || !buffer) return fail(l, VL_RC_BADARG);
-  if (length <= 0) return fail(l, VL_RC_OK);
+  if (length <= 0) {
+    buffer[0] = 0;
+    return fail(l, VL_RC_OK);
+  }
   const size_t scratchSize = size_t(length) * kBytesPerUnit + 2;
   Block<char> scratch(scratchSize);
   bool failed = !scratch;

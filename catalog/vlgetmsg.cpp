@@ -10,7 +10,10 @@ uint32_t VLGetMessage(VLCatalog *catalog, uint32_t set, uint32_t message, char *
   VLLocale *l = reportTo(catalog);
   if (!catalog || !buffer) VL_RET(fail(l, VL_RC_BADARG));
   vl::setRc(l, VL_RC_OK);
-  if (length <= 0) VL_RET(uint32_t{0});
+  if (length <= 0) {
+    buffer[0] = 0;  // callers print the buffer whatever the length said
+    VL_RET(uint32_t{0});
+  }
   VLMcSet record;
   const char *text = nullptr;
   size_t n = 0;

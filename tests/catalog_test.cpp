@@ -149,6 +149,10 @@ TEST_F(Catalog, EveryDirectiveReadBackInBothModesIntoOtherCodePages) {
       EXPECT_EQ(VLGetMessage(c, 3, 2, buf, sizeof buf, nullptr, 0), 72u) << "deleted set";
       EXPECT_EQ(VLGetMessage(c, 1, 5, buf, sizeof buf, "fallback", 0), 0u);
       EXPECT_STREQ(buf, "fallback");
+      EXPECT_EQ(VLGetMessage(c, 1, 5, buf, 4, "fallback", 0), 0u);
+      EXPECT_STREQ(buf, "fal") << "a default cut to the buffer";
+      EXPECT_EQ(VLGetMessage(c, 1, 1, buf, 0, nullptr, 0), 0u);
+      EXPECT_EQ(buf[0], 0) << "no room still leaves an empty string";
       EXPECT_EQ(VLCloseCatalog(c), 0u);
     }
   }
