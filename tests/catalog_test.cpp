@@ -11,6 +11,7 @@
 #include <filesystem>
 #include <fstream>
 #include <map>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -294,6 +295,33 @@ TEST_F(Catalog, DamagedFilesAreRefusedWith71) {
       for (uint32_t m = 1; m <= 3; ++m) refused |= VLGetMessage(c, s, m, buf, sizeof buf, nullptr, 0) == 71;
     EXPECT_TRUE(refused) << d.name;
     VLCloseCatalog(c);
+  }
+  VLReleaseLocale(utf8);
+}
+
+TEST_F(Catalog, RandomlyDamagedFilesNeverCrash) {
+  const Built good = build({{1, {1, 2, 5}}, {2, {1, 2, 3}}, {8, {4}}});
+  VLLocale *utf8 = locale("English_UnitedStates.UTF-8");
+  std::mt19937 rng(71);
+  for (int round = 0; round < 250; ++round) {
+    Bytes f = good.file;
+    for (int k = 1 + static_cast<int>(rng() % 4); k > 0; --k) {
+      size_t at = 152 + rng() % (f.size() - 152);
+      f[at] = static_cast<char>(rng() % 3 == 0 ? 0xFF : rng());
+    }
+    if (rng() % 5 == 0) f.resize(rng() % f.size());
+    writeFile(dir.file("r.cat"), f);
+    for (uint32_t mode : {0u, VL_CAT_INMEMORY}) {
+      VLCatalog *c = VLOpenCatalog(utf8, nullptr, dir.file("r.cat").c_str(), mode);
+      if (!c) continue;
+      char buf[64];
+      for (uint32_t s = 1; s <= 9; ++s)
+        for (uint32_t m = 1; m <= 6; ++m) {
+          uint32_t rc = VLGetMessage(c, s, m, buf, sizeof buf, nullptr, 0);
+          EXPECT_TRUE(rc == 0 || rc == 71 || rc == 72) << rc;
+        }
+      VLCloseCatalog(c);
+    }
   }
   VLReleaseLocale(utf8);
 }

@@ -12,6 +12,7 @@
 #include <fstream>
 #include <iterator>
 #include <memory>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -134,6 +135,29 @@ TEST_F(Stream, EveryChunkingAndEveryPauseReadsTheSameCharacters) {
         EXPECT_EQ(codes.back(), 0) << t.name << ": clean end";
         EXPECT_EQ(VLCloseStream(s, l), 1);
       }
+  }
+}
+
+TEST_F(Stream, RandomShiftTextInRandomPiecesAgreesWithTheStringConversion) {
+  std::mt19937 rng(930);
+  for (int round = 0; round < 200; ++round) {
+    Bytes text;
+    bool dbl = false;
+    for (int n = 1 + static_cast<int>(rng() % 40); n > 0; --n) {
+      if (rng() % 4 == 0) text += (dbl = !dbl) ? '\x0E' : '\x0F';
+      if (dbl) text += {static_cast<char>(0x45 + rng() % 4), static_cast<char>(0x41 + rng() % 0xBD)};
+      else text += static_cast<char>(0xC1 + rng() % 9);
+    }
+    std::vector<VLWChar> want(text.size() + 1);
+    want.resize(static_cast<size_t>(
+        VLMbToWideEx(ebcdic_, want.data(), static_cast<int32_t>(want.size()), text.data(), 0,
+                     static_cast<int32_t>(text.size()), 0)));
+    Medium m{text};
+    m.chunk = 1 + rng() % 3;
+    for (int k = static_cast<int>(rng() % 4); k > 0; --k) m.pauses.push_back(rng() % (text.size() + 1));
+    VLStream *s = open(m, ebcdic_);
+    EXPECT_EQ(readAll(s, ebcdic_, m), want) << "round " << round;
+    VLCloseStream(s, ebcdic_);
   }
 }
 
