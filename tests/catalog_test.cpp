@@ -161,7 +161,8 @@ TEST_F(Catalog, EveryDirectiveReadBackInBothModesIntoOtherCodePages) {
 }
 
 TEST_F(Catalog, AgreesWithTheCLibrarysGencatAndCatgets) {
-  const Bytes src = source("plain") + "$set 2\n10 ten\n1 one\nSYM symbolic\n5 \\0101\\400x\\q\n";
+  const Bytes src = source("plain") + "$set 2\n10 ten\n1 one\nSYM symbolic\n5 \\0101\\400x\\q \\\\ \\101\\102\n"
+                    "$set 12\n$set NAMED\n1 in a symbolic set\n";
   writeFile(dir.file("o.msg"), src);
   const std::string ours = dir.file("ours.cat"), theirs = dir.file("theirs.cat");
   ASSERT_EQ(gencat("--locale English_UnitedStates.UTF-8 " + ours + " " + dir.file("o.msg")), 0);

@@ -123,6 +123,11 @@ class Compiler {
     *v = static_cast<uint32_t>(n);
     return i > start;
   }
+  std::string symbol(const std::string &s, size_t &i) {
+    std::string name;
+    while (i < s.size() && (syn_.letter(at(s, i)) || syn_.digit(at(s, i), 10) >= 0)) name += s[i++];
+    return name;
+  }
   bool word(const std::string &s, size_t i, const char *w) {
     for (; *w; ++w, ++i)
       if (!syn_.is(at(s, i), *w)) return false;
@@ -141,10 +146,11 @@ class Compiler {
     if (syn_.digit(b0, 10) >= 0) {
       if (!number(s, i, &n)) return ++errors, error("message number out of range");
     } else if (syn_.letter(b0)) {
-      std::string name;
-      while (i < s.size() && (syn_.letter(at(s, i)) || syn_.digit(at(s, i), 10) >= 0)) name += s[i++];
+      // A symbolic name numbers its message one past the highest of the set.
+      std::string name = symbol(s, i);
       auto &set = cat_.sets[set_];
-      n = set.empty() ? 1 : set.rbegin()->first + 1;
+      auto known = symbols_[set_].find(name);
+      n = known != symbols_[set_].end() ? known->second : set.empty() ? 1 : set.rbegin()->first + 1;
       symbols_[set_][name] = n;
     } else {
       return ++errors, error("malformed line");
@@ -179,10 +185,17 @@ class Compiler {
       const bool del = syn_.is(at(s, 1), 'd');
       i += del ? 6 : 3;
       while (i < s.size() && syn_.blank(at(s, i))) ++i;
-      uint32_t n;
-      if (!number(s, i, &n) || n == 0) return ++errors, error("invalid set number");
+      uint32_t n = 0;
+      if (!del && syn_.letter(at(s, i))) {  // a symbolic set: one past the last set named
+        std::string name = symbol(s, i);
+        auto known = setSymbols_.find(name);
+        n = known != setSymbols_.end() ? known->second : lastSet_ + 1;
+        setSymbols_[name] = n;
+      } else if (!number(s, i, &n) || n == 0) {
+        return ++errors, error("invalid set number");
+      }
       if (!del) {
-        set_ = n;
+        set_ = lastSet_ = n;
         cat_.sets[n];
         return;
       }
@@ -270,6 +283,8 @@ class Compiler {
   std::map<std::pair<uint32_t, uint32_t>, Where> defined_;
   std::map<std::pair<uint32_t, uint32_t>, bool> replaceable_;
   std::map<uint32_t, std::map<std::string, uint32_t>> symbols_;
+  std::map<std::string, uint32_t> setSymbols_;
+  uint32_t lastSet_ = 0;
 
  public:
   // Messages of an existing catalog: the sources may replace them without complaint.
