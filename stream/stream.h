@@ -306,7 +306,7 @@ int32_t readString(VLStream *s, VLLocale *locale, T *out, int32_t size, uint32_t
   const uint32_t cap = static_cast<uint32_t>(size) - (term ? 1u : 0u);
   uint32_t st = stateIO && *stateIO ? 1u : 0u;
   uint32_t used = 0, chars = 0, crAt = 0;
-  bool prevCr = false, any = false, failed = false;
+  bool prevCr = false, any = false, ended = false;
   Block<uint8_t> work(K == Form::kU ? static_cast<uint8_t *>(alloc(2)) : nullptr);
   if (K == Form::kU && !work) {
     setRc(l, VL_RC_NOMEM);
@@ -316,10 +316,16 @@ int32_t readString(VLStream *s, VLLocale *locale, T *out, int32_t size, uint32_t
     VLWChar v;
     if constexpr (K == Form::kU) {
       VLUChar u;
-      if (!readUnit(s, l, work.get(), &u)) break;
+      if (!readUnit(s, l, work.get(), &u)) {
+        ended = true;
+        break;
+      }
       v = u;
     } else {
-      if (!readChar(s, l, pg, &v)) break;
+      if (!readChar(s, l, pg, &v)) {
+        ended = true;
+        break;
+      }
     }
     any = true;
     uint8_t mb[4];
@@ -360,9 +366,8 @@ int32_t readString(VLStream *s, VLLocale *locale, T *out, int32_t size, uint32_t
     crAt = used - 1;
     if (eol) break;
   }
-  if (l->lastError != VL_RC_OK) failed = true;
-  if (failed) return any ? static_cast<int32_t>(byChars ? chars : used) : -2;
-  if (!any) {
+  if (l->lastError != VL_RC_OK) return any ? static_cast<int32_t>(byChars ? chars : used) : -2;
+  if (ended && !any) {
     if (term) out[0] = 0;
     return -1;
   }

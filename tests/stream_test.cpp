@@ -339,6 +339,7 @@ const LineCase kLines[] = {
     {"a CR in the last place still meets its LF", "ab\r\ncd", 3, VL_EOL_CRLF | VL_OPT_STRIPEOL, 2, "ab", "cd"},
     {"empty line", "\ncd", 10, VL_EOL_LF | VL_OPT_STRIPEOL, 0, "", "cd"},
     {"end of data", "", 10, VL_EOL_LF, -1, "", ""},
+    {"room for the 0 alone", "ab", 1, VL_OPT_NULLTERM, 1, Bytes("\0", 1), "ab"},
     {"a bad option", "ab", 10, 0x10000, -2, "", "ab"},
 };
 
