@@ -16,6 +16,8 @@ const Command kCommands[] = {
     {"locale", cmdLocale, "locale NAME [--dir DIR]      build a locale and show what it is made of"},
     {"convert", cmdConvert, "convert -f FROM -t TO [FILE...]  convert text between code pages"},
     {"info", cmdInfo, "info LOCALE [--items N,...] [--defaults]  show the information items of a locale"},
+    {"gencat", cmdGencat, "gencat [--locale NAME] OUTPUT.cat SOURCE.msg...  compile message sources"},
+    {"catalog", cmdCatalog, "catalog FILE.cat            list a catalog as message source"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
 };
 
