@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#include "tools/tlx/catfile.h"
+
 namespace {
 
 std::vector<unsigned char> slurp(const std::string &path) {
@@ -68,6 +70,19 @@ int main(int argc, char **argv) {
                  samples[s % 4]);
   for (unsigned char s = 0; s < 14; s += 3)
     ok &= text(out + "/translate", "t" + std::to_string(s), {0, s, 0x03, 40, 1}, samples[s % 4]);
+  catfile::Catalog cat;
+  cat.locale = "German_Germany.MS1252";
+  cat.sets[1] = {{1, "Datei nicht gefunden"}, {2, "Gr\xFC\xDF" "e"}, {7, ""}};
+  cat.sets[3] = {{1, "three"}, {100000, "far"}};
+  std::string image = catfile::write(cat);
+  for (unsigned char sel : {0, 1, 0x80, 0x82})
+    ok &= text(out + "/catalog", "cat" + std::to_string(sel), {sel}, image);
+  const std::string sources[] = {
+      "$ a comment\n$set 1\n1 Hello\n2 Two \\\n  lines\n3\n$quote \"\n4 \"quoted\\t\\101\"\n",
+      "$set 2\n$delset 2\n$set 3 comment\n10 ten\n5 five\n$set 1\n1 \x82\xA0\x82\xA2\n",
+      "$set 1\n1 \x0E\x45\x41\x0F ab\n"};
+  for (unsigned char sel = 0; sel < 4; ++sel)
+    ok &= text(out + "/msgsource", "msg" + std::to_string(sel), {sel}, sources[sel % 3]);
   if (!ok) {
     std::fprintf(stderr, "mkseeds: could not write the seeds under %s\n", out.c_str());
     return 1;

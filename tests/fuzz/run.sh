@@ -20,7 +20,7 @@ for src in "$here"/fuzz_*.cpp; do
   if [ "$mode" = smoke ]; then limit=(-runs=3000); else limit=(-max_total_time="$mode"); fi
   # Definition files are large; text and names are not, and short inputs fuzz faster.
   case $name in
-    control|language|territory|codepage|alias|sort) maxlen=200000 ;;
+    control|language|territory|codepage|alias|sort|catalog) maxlen=200000 ;;
     *) maxlen=4096 ;;
   esac
   echo "== $name"
