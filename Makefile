@@ -36,7 +36,7 @@ asan: setup $(ASAN_BUILD)/CMakeCache.txt
 # The thread tests under ThreadSanitizer, in a build of their own; a race fails the run.
 tsan: setup $(TSAN_BUILD)/CMakeCache.txt
 	cmake --build $(TSAN_BUILD) -j $(JOBS) --target tlx_tests
-	cd $(TSAN_BUILD) && TSAN_OPTIONS="halt_on_error=1 second_deadlock_stack=1" ./tlx_tests --gtest_brief=1 --gtest_filter='ServiceThreads.*'
+	cd $(TSAN_BUILD) && TSAN_OPTIONS="halt_on_error=1 second_deadlock_stack=1" ./tlx_tests --gtest_brief=1 --gtest_filter='*Threads*'
 
 fuzz-build: setup $(FUZZ_BUILD)/CMakeCache.txt
 	cmake --build $(FUZZ_BUILD) -j $(JOBS)

@@ -679,15 +679,18 @@ struct Shape {
   unsigned perChar;  // most output units one character takes
 };
 
+// takeBack: the 0 was asked for, so the last double-byte character gives way to it;
+// otherwise a 0 that does not fit is simply not written.
 template <class W>
-inline bool terminate(W &w, decltype(W::o) limit, size_t &chars, bool countChars, const VLCodePage *c) {
+inline bool terminate(W &w, decltype(W::o) limit, size_t &chars, bool countChars, const VLCodePage *c,
+                      bool takeBack) {
   if constexpr (requires { w.so; }) {
     // An open double-byte run is closed first; without room for Shift-In and the 0 the
     // last double-byte character gives way.
     if (w.state == 1) {
       unsigned wide = cp::maxLen(c);
       if (limit - w.o < 2) {
-        if (static_cast<size_t>(w.o - w.start) < wide) return false;
+        if (!takeBack || static_cast<size_t>(w.o - w.start) < wide) return false;
         w.o -= wide;
         if (countChars && chars) --chars;
       }
@@ -700,6 +703,7 @@ inline bool terminate(W &w, decltype(W::o) limit, size_t &chars, bool countChars
   }
   (void)c;
   (void)countChars;
+  (void)takeBack;
   if (w.o >= limit) return false;
   *w.o++ = 0;
   return true;
@@ -729,9 +733,9 @@ inline int32_t drive(R &r, Make &&make, const Shape &s, const VLCodePage *target
     Stop st = pump(r, w, chars, maxChars, held);
     bool wrote = false;
     if (s.nullTerm)
-      wrote = terminate(w, w.end + 1, chars, s.charLen, target);
+      wrote = terminate(w, w.end + 1, chars, s.charLen, target, true);
     else if (s.negIn && st == Stop::Done && chars < maxChars)
-      wrote = terminate(w, w.end, chars, s.charLen, target);
+      wrote = terminate(w, w.end, chars, s.charLen, target, false);
     size_t n = s.charLen ? chars + (s.nullTerm && wrote ? 1 : 0)
                          : static_cast<size_t>(w.o - w.start) - (wrote && !s.nullTerm ? 1 : 0);
     return static_cast<int32_t>(n);

@@ -14,6 +14,9 @@ constexpr uint32_t kTypeTrieOff = 4370, kTypeRecOff = 4372, kValueOff = 4374, kH
 // First-generation bodies: the same header without the shift bytes, four offsets.
 constexpr uint32_t kV1Header = 4372;
 
+// The most bytes any character of any page converts to, whatever its body claims.
+constexpr unsigned kMaxCharBytes = 4;
+
 constexpr uint16_t kFlagAscii = 0x0001, kFlagShift = 0x0002;
 constexpr uint32_t kNodeSize = 6, kTypeNodeSize = 4, kRecordSize = 8, kIndexSize = 8;
 

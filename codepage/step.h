@@ -270,10 +270,10 @@ inline uint32_t eolSearchKinds(uint32_t opts) {
 template <class F>
 char *getEolBytes(VLLocale *l, F f, const char *s, int32_t length, uint32_t *kind, int32_t *eolLength,
                   uint32_t options, uint32_t *stateOut = nullptr) {
-  if ((options & VL_OPT_CHARLEN) && length > 0 && s) {
+  // The bit goes whatever the length: a length of 0 or below counts nothing.
+  if ((options & VL_OPT_CHARLEN) && length > 0 && s)
     length = static_cast<int32_t>(unitsOf(f, ub(s), static_cast<uint32_t>(length)));
-    options &= ~VL_OPT_CHARLEN;
-  }
+  options &= ~VL_OPT_CHARLEN;
   uint32_t kinds = eolSearchKinds(options);
   if (!kinds) {
     eolRefused(l, kind, eolLength);

@@ -47,15 +47,20 @@ int32_t highestNode(const uint8_t *t, uint32_t nodes) {
   return static_cast<int32_t>(highest);
 }
 
-// Builds the widened trie block; returns false only when memory ran out or the block
-// would not fit a section.
+// Builds the widened trie block; returns false only when memory ran out. The block may
+// outgrow a file section (it never goes back to disk); a value offset that no longer fits
+// its 16-bit field leaves no trie, which the check refuses as malformed.
 bool widenTrie(const uint8_t *t, uint32_t size, uint8_t **out, uint32_t *outSize, uint16_t *valueOff) {
   int32_t high = highestNode(t, size / kV1NodeSize);
   if (high < 0) return false;
   uint32_t nodes = static_cast<uint32_t>(high) + 1;
   uint32_t oldValues = nodes * kV1NodeSize, newValues = nodes * cp::kNodeSize;
   uint32_t total = newValues + (size - oldValues);
-  if (total > kMaxSection) return false;
+  if (newValues > kMaxSection) {
+    *out = nullptr;
+    *outSize = 0;
+    return true;
+  }
   vl::Block<uint8_t> block(total);
   if (!block) return false;
   uint8_t *n = block.get();
@@ -82,7 +87,7 @@ void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, uint32_t
                  VLCodePage *record) {
   VL_FLOW("VLCpV1toV2");
   if (newTrie) *newTrie = nullptr;
-  if (!body || !newTrie || !record || bodySize < cp::kV1Header || bodySize > kMaxSection - kGrowth) {
+  if (!body || !newTrie || !record || bodySize < cp::kV1Header) {
     VL_ERR("Code page body of %d bytes cannot be converted", static_cast<int>(bodySize));
     VL_RET(static_cast<void *>(nullptr));
   }
@@ -126,8 +131,8 @@ void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, uint32_t
     putBe16(b + cp::kValueOff, valueOff);
   }
   *newTrie = t;
-  record->sectionSize[0] = static_cast<uint16_t>(size);
-  record->sectionSize[1] = static_cast<uint16_t>(tSize);
+  record->sectionSize[0] = size;
+  record->sectionSize[1] = tSize;
   VL_DETAIL("Converted code page body: %d bytes, trie %d bytes", static_cast<int>(size), static_cast<int>(tSize));
   VL_RET(static_cast<void *>(out.take()));
 }

@@ -27,8 +27,9 @@ struct VLFile {
   uint8_t isTemp;
   uint8_t isWrite;
   uint8_t atEnd;
-  char savedPath[256];
-  char savedExt[6];
+  // Writing over an existing file: the file's name and the temporary's, in one block.
+  char *finalName;
+  char *tempName;
 };
 
 namespace vl {

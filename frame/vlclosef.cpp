@@ -14,19 +14,17 @@ int VLCloseFile(VLFile *file, int discard) {
   file->descriptor = -1;
   int rc = 0;
   if (file->isTemp) {
-    char temp[300], final[300];
-    std::snprintf(temp, sizeof temp, "%stmp", file->savedPath);
-    std::snprintf(final, sizeof final, "%s%s", file->savedPath, file->savedExt);
     if (discard == 1) {
-      ::unlink(temp);
+      ::unlink(file->tempName);
     } else {
-      VL_STATE("Renaming %s to %s", temp, final);
-      if (::access(final, W_OK) != 0 || ::rename(temp, final) != 0) {
+      VL_STATE("Renaming %s to %s", file->tempName, file->finalName);
+      if (::access(file->finalName, W_OK) != 0 || ::rename(file->tempName, file->finalName) != 0) {
         VL_ERR("Close failed, rc = %d", errno);
         rc = 1;
       }
     }
   }
+  vl::release(file->finalName);
   vl::release(file);
   VL_RET(rc);
 }

@@ -34,7 +34,7 @@ uint32_t VLInit(const char *directory, VLAllocHook allocHook, VLFreeHook freeHoo
     uint32_t rc;
     if (!m) {
       g->fileContext = 0;
-      rc = mrc == VL_RC_NOMEM ? VL_RC_NOMEM : VL_RC_NOMANAGER;
+      rc = VL_RC_NOMANAGER;  // whatever the manager ran into
     } else {
       g->objManager = m;
       ++g->initCount;

@@ -33,28 +33,39 @@ VLFile *VLOpenFile(uint32_t, const char *name, int mode, int noTemp, uint32_t *r
   int fd;
   if (mode == VL_FILE_WRITE) {
     const char *target = name;
-    char temp[512];
     if (!noTemp && access(name, F_OK) == 0) {
-      char drive[vl::path::kDriveMax], dir[vl::path::kDirMax], file[vl::path::kFileMax], ext[vl::path::kExtentMax];
-      SplitPath(name, drive, dir, file, ext);
-      size_t need = std::strlen(drive) + std::strlen(dir) + std::strlen(file) + 4;
-      if (need < sizeof f->savedPath && *file) {
-        MakePath(f->savedPath, drive, dir, file, nullptr);
-        std::memcpy(f->savedExt, ext, std::strlen(ext) + 1);
-        std::memcpy(temp, f->savedPath, std::strlen(f->savedPath) + 1);
-        std::strcat(temp, "tmp");
-        VL_STATE("Using temp file %s", temp);
-        f->isTemp = 1;
-        target = temp;
+      // The temporary takes the name without its extension plus "tmp", beside the file,
+      // whatever the lengths: the named file stays intact until the close.
+      vl::path::Pieces p = vl::path::split(name);
+      size_t n = std::strlen(name), base = p.dot;
+      if (p.dotName || p.nameEnd == p.dirEnd) {
+        *rc = VL_RC_FILE_IO;
+        VL_ERR("Unable to open %s, err = %d", name, EISDIR);
+        VL_RET(static_cast<VLFile *>(nullptr));
       }
+      auto *names = static_cast<char *>(vl::alloc(n + 1 + base + 4));
+      if (!names) {
+        *rc = VL_RC_NOMEM;
+        VL_RET(static_cast<VLFile *>(nullptr));
+      }
+      std::memcpy(names, name, n + 1);
+      f->finalName = names;
+      f->tempName = names + n + 1;
+      std::memcpy(f->tempName, name, base);
+      std::memcpy(f->tempName + base, "tmp", 4);
+      VL_STATE("Using temp file %s", f->tempName);
+      f->isTemp = 1;
+      target = f->tempName;
     }
     fd = ::open(target, O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
   } else {
     fd = ::open(name, (mode == VL_FILE_READWRITE ? O_RDWR : O_RDONLY) | O_CLOEXEC);
   }
   if (fd < 0) {
-    *rc = openError(errno);
-    VL_ERR("Unable to open %s, err = %d", name, errno);
+    int e = errno;
+    vl::release(f->finalName);
+    *rc = openError(e);
+    VL_ERR("Unable to open %s, err = %d", name, e);
     VL_RET(static_cast<VLFile *>(nullptr));
   }
   f->descriptor = fd;

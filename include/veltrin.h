@@ -80,7 +80,7 @@ typedef struct VLObjEntry {
   char name[34];
   VLFile *file;
   void *section[4];
-  uint16_t sectionSize[4];
+  uint32_t sectionSize[4];  /* upgraded sections may exceed a file section */
 } VLObjEntry;
 
 /* A loaded code page is its object entry: section 0 body, 1 conversion trie,

@@ -16,9 +16,9 @@ VLUChar *vl::loc::copyU(const VLUChar *u) {
 
 char *vl::loc::toCodePage(const VLCodePage *cp, const VLUChar *u) {
   size_t n = ulen(u);
-  // Each unit takes at most the maximum length and one shift byte; then a closing
-  // shift byte and the terminator.
-  auto *out = static_cast<unsigned char *>(alloc(n * (cp::maxLen(cp) + 1u) + 2));
+  // Each unit takes at most the longest character and one shift byte; then a closing
+  // shift byte and the terminator. Not the page's own maximum: a body could understate it.
+  auto *out = static_cast<unsigned char *>(alloc(n * (cp::kMaxCharBytes + 1u) + 2));
   if (!out) return nullptr;
   bool shift = cp::isShift(cp);
   bool dbcs = false;

@@ -25,8 +25,8 @@ uint32_t VLLocaleChangeCodePage(VLLocale *locale, VLObjEntry *codePage) {
     l->texts[i] = nullptr;
     if (!before.texts[i]) continue;
     size_t n = std::strlen(before.texts[i]);
-    // Room for every character at full length plus a shift byte each way.
-    auto *t = static_cast<char *>(vl::alloc((vl::cp::maxLen(codePage) + 2u) * n + 2));
+    // Room for every character at the longest any page has plus a shift byte each way.
+    auto *t = static_cast<char *>(vl::alloc((vl::cp::kMaxCharBytes + 2u) * n + 2));
     if (!t) {
       rc = VL_RC_NOMEM;
       break;

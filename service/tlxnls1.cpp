@@ -6,6 +6,7 @@
 
 #include "store/store.h"
 #include "locale/locale.h"
+#include "locale/native.h"
 #include "service/service.h"
 
 VL_TRACE_MODULE("tlxnls1");
@@ -120,11 +121,8 @@ uint32_t objectId(const char *name, int type, uint32_t *rcOut) {
     if (const char *canonical = VLGetCodepageFromAlias(manager(), name)) name = canonical;
   VLObjEntry *e = VLGetObjFromName(manager(), static_cast<uint16_t>(type), name,
                                    static_cast<int32_t>(std::strlen(name)), 1, rc);
-  if (!e) {
-    if (!*rc) *rc = VL_RC_NOTFOUND;  // "Binary" names no sort object
-    return 0;
-  }
-  return e->id;
+  // No entry and no error: "Binary" names binary order, whose sort id is 0.
+  return e ? e->id : 0;
 }
 
 }  // namespace
@@ -221,6 +219,8 @@ uint32_t NLS1_SetNativeFromLocale(VLLocale *locale, int category) {
     VL_ERR("NLS1_ConvertLocale failed with rc = %d", static_cast<int>(VL_RC_NOTFOUND));
     VL_RET(vl::setRc(l, VL_RC_NOTFOUND));
   }
+  // The library's own save/set/restore sequences hold this lock; so must a setting of ours.
+  vl::LockGuard lock(vl::nat::platformLock());
   if (!std::setlocale(category, native)) {
     VL_ERR("setlocale failed to setlocale to %s", native);
     VL_RET(vl::setRc(l, VL_RC_OPEN));
@@ -357,14 +357,16 @@ uint32_t NLS1_GetObjectName(uint32_t id, char *out, int32_t outSize, int type) {
   if (!out || outSize < 0 || type < 0 || type > 3 || id > 0xFFFF) VL_RET(VL_RC_BADARG);
   uint32_t rc = 0;
   VLObjEntry *e = vl::store::objById(manager(), static_cast<uint16_t>(type), static_cast<uint16_t>(id), 1, &rc);
-  if (!e) VL_RET(rc ? rc : VL_RC_NOTFOUND);
-  size_t n = strnlen(e->name, sizeof e->name);
+  // Sort id 0 is binary order: no object, and the name its lookup by name takes.
+  if (!e && (rc || type != VL_OBJ_SORT || id != 0)) VL_RET(rc ? rc : VL_RC_NOTFOUND);
+  const char *name = e ? e->name : "Binary";
+  size_t n = strnlen(name, sizeof e->name);
   if (n >= static_cast<size_t>(outSize)) {
     VL_ERR("Object name length (%d) for %.*s exceeds output buffer length (%d)", static_cast<int>(n),
-           static_cast<int>(n), e->name, static_cast<int>(outSize));
+           static_cast<int>(n), name, static_cast<int>(outSize));
     VL_RET(VL_RC_BUFFER);
   }
-  std::memcpy(out, e->name, n);
+  std::memcpy(out, name, n);
   out[n] = 0;
   VL_RET(VL_RC_OK);
 }

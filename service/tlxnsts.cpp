@@ -158,6 +158,18 @@ size_t measure(const Side &side, const uint8_t *s) {
   return n;
 }
 
+// A load reports every unopenable file as 1003; this layer tells a missing one apart.
+uint32_t fileCode(VLObjManager *m, uint32_t id, uint32_t lrc) {
+  char name[300];
+  if (lrc != VL_RC_FILE_IO || !m || !VLGetDataFileName(m->directory, VL_OBJ_CODEPAGE, static_cast<int>(id), name,
+                                                       sizeof name))
+    return lrc;
+  uint32_t orc = 0;
+  VLFile *f = VLOpenFile(vlglobals ? vlglobals->fileContext : 0, name, VL_FILE_READ, 1, &orc);
+  if (f) VLCloseFile(f, 0);
+  return orc == VL_RC_FILE_MISSING ? orc : lrc;
+}
+
 // Looks a side up; 0 or the code that fails the call. fileRc receives a load code of a
 // code page that was replaced by the built-in one.
 uint32_t classify(uint32_t id, Side *side, const char *which, uint32_t *fileRc) {
@@ -165,6 +177,7 @@ uint32_t classify(uint32_t id, Side *side, const char *which, uint32_t *fileRc) 
   uint32_t lrc = 0;
   VLObjManager *m = vlglobals ? vlglobals->objManager : nullptr;
   VLObjEntry *e = id <= 0xFFFF ? vl::store::objById(m, VL_OBJ_CODEPAGE, static_cast<uint16_t>(id), 0, &lrc) : nullptr;
+  lrc = fileCode(m, id, lrc);
   if (!e || !vl::cp::body(e)) {
     VL_ERR("Unable to locate codepage %d", static_cast<int>(id));
     if (lrc == VL_RC_FILE_MISSING) return VL_RC_NOCODEPAGE;

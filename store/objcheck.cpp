@@ -3,7 +3,7 @@
 // character primitives can trust the tables.
 #include <algorithm>
 
-#include "codepage/cpbody.h"
+#include "codepage/cpprim.h"
 #include "store/store.h"
 
 namespace {
@@ -114,6 +114,12 @@ struct SwapMap {
   }
 };
 
+// A value of a table that turns into code page bytes takes no more than the maximum length.
+bool fits(VLWChar v, unsigned maxLen) {
+  uint8_t bytes[4];
+  return static_cast<unsigned>(vl::cp::wToMb(bytes, v)) <= maxLen;
+}
+
 uint32_t checkCodePage(VLObjEntry *e) {
   namespace cp = vl::cp;
   auto *b = static_cast<uint8_t *>(e->section[0]);
@@ -134,6 +140,8 @@ uint32_t checkCodePage(VLObjEntry *e) {
     if (l < 1 || l > 4 || (!shift && l > maxLen)) return kBad;
   }
   if (shift && (maxLen < 2 || b[cp::kShiftOut] == b[cp::kShiftIn])) return kBad;
+  // Writers size their buffers from the maximum length: UTF-8 is computed up to 3 bytes.
+  if (utf8 && maxLen < 3) return kBad;
 
   // Variable tables: each runs to the next table's start or the end of the body.
   const uint32_t at[4] = {cp::kFullOff, cp::kPairOff, cp::kTypeTrieOff, cp::kTypeRecOff};
@@ -149,12 +157,18 @@ uint32_t checkCodePage(VLObjEntry *e) {
   }
   if (start[0]) {
     if (end[0] - start[0] < 1024) return kBad;
-    for (int i = 0; i < 256; ++i) swap32(b + start[0] + 4 * i);
+    for (int i = 0; i < 256; ++i) {
+      swap32(b + start[0] + 4 * i);
+      if (!fits(vl::rd32(b + start[0] + 4 * i), maxLen)) return kBad;
+    }
   }
   uint32_t pairs = vl::rd16(b + cp::kPairCount);
   if (pairs) {
     if (!start[1] || (end[1] - start[1]) / 8 < pairs) return kBad;
-    for (uint32_t i = 0; i < pairs * 2; ++i) swap32(b + start[1] + 4 * i);
+    for (uint32_t i = 0; i < pairs * 2; ++i) {
+      swap32(b + start[1] + 4 * i);
+      if (!fits(vl::rd32(b + start[1] + 4 * i), maxLen)) return kBad;
+    }
   }
   bool needTrie = maxLen > 1 && !utf8;
   if (start[2] || start[3]) {
@@ -210,6 +224,8 @@ uint32_t checkCodePage(VLObjEntry *e) {
     if (highWidth && (!high || hi + n * highWidth > e->sectionSize[3])) return kBad;
     if (lowWidth == 2) lowMap.run(low, lo, n);
     if (highWidth == 2) highMap.run(high, hi, n);
+    for (unsigned l = x[2]; l <= x[3] && l < 256; ++l)
+      if (!fits(vl::cp::indexValue(e, x, static_cast<VLUChar>(i << 8 | l)), maxLen)) return kBad;
   }
   return 0;
 }

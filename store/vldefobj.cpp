@@ -3,11 +3,9 @@
 
 int VLLoadDefaultObj(VLObjManager *, VLObjEntry *e) {
   if (!e || e->type > VL_OBJ_CODEPAGE) return 1;
-  for (int i = 0; i < 4; ++i) {
-    e->section[i] = nullptr;
-    e->sectionSize[i] = 0;
-  }
-  e->section[2] = nullptr;
+  // Section 0 is left alone until the release store below: lock-free lookups read it.
+  for (int i = 1; i < 4; ++i) e->section[i] = nullptr;
+  for (int i = 0; i < 4; ++i) e->sectionSize[i] = 0;
   if (e->type == VL_OBJ_CODEPAGE) {
     e->section[2] = const_cast<void *>(VLDefCP3);
     e->sectionSize[2] = vl::kBuiltinSize[3];

@@ -9,7 +9,7 @@ namespace {
 
 struct Loaded {
   void *section[4] = {};
-  uint16_t size[4] = {};
+  uint32_t size[4] = {};
   uint8_t flags = 0;  // 0x02.. for sections the library allocated itself
 
   void releaseAll() {
@@ -29,8 +29,10 @@ uint32_t readObject(VLObjManager *m, VLObjEntry *e, Loaded *out) {
   uint32_t rc = 0;
   e->file = VLOpenFile(vlglobals ? vlglobals->fileContext : 0, name, VL_FILE_READ, 1, &rc);
   if (!e->file) {
+    // The open's own reason is traced; a load reports every unopenable file alike, but
+    // running out of memory stays passing (see below).
     VL_ERR("Unable to open %s, err = %d", name, static_cast<int>(rc));
-    return rc ? rc : VL_RC_FILE_IO;
+    return rc == VL_RC_NOMEM ? rc : VL_RC_FILE_IO;
   }
   vl::Block<uint8_t> raw(static_cast<uint8_t *>(VLLoadFile(e->file, 0, vl::store::kHeaderSize, &rc)));
   if (!raw) return rc ? rc : VL_RC_FILE_IO;
@@ -74,18 +76,23 @@ VLObjEntry *VLLoadObj(VLObjManager *m, VLObjEntry *e, uint32_t *rcOut) {
   if (__atomic_load_n(&e->section[0], __ATOMIC_ACQUIRE)) VL_RET(e);
   vl::LockGuard lock(vlglobals ? &vlglobals->lock : nullptr);
   if (e->section[0]) VL_RET(e);
+  // Everything is read, upgraded, checked and byte-swapped in a private copy of the entry;
+  // the shared entry changes only once the object is complete, and its body pointer is
+  // stored last so that the lock-free lookups never see a half-checked object.
   Loaded l;
-  uint32_t code = readObject(m, e, &l);
+  VLObjEntry priv = *e;
+  uint32_t code = readObject(m, &priv, &l);
   if (code == 0) {
     for (int i = 0; i < 4; ++i) {
-      e->section[i] = l.section[i];
-      e->sectionSize[i] = l.size[i];
+      priv.section[i] = l.section[i];
+      priv.sectionSize[i] = l.size[i];
     }
-    code = vl::store::checkObject(e);
-    for (int i = 0; i < 4; ++i) e->section[i] = nullptr;
+    code = vl::store::checkObject(&priv);
   }
+  e->file = priv.file;
   if (code == 0) {
     e->flags = static_cast<uint8_t>((e->flags & 0x01) | l.flags);
+    for (int i = 0; i < 4; ++i) e->sectionSize[i] = priv.sectionSize[i];
     for (int i = 3; i >= 1; --i) e->section[i] = l.section[i];
     __atomic_store_n(&e->section[0], l.section[0], __ATOMIC_RELEASE);
     VL_RET(e);

@@ -60,22 +60,22 @@ int32_t copy(F f, U<F> *dst, uint32_t dstState, int32_t dstLen, const U<F> *src,
   uint32_t pos = limit;
   if (!f.singleByte()) {
     pos = 0;
-    bool lastShift = false;
+    uint32_t kept = 0;  // end of the last whole character: the copy never ends on shift bytes
     while (pos < limit) {
       if constexpr (F::kShift) {
         if (f.isShift(s[pos])) {
           f.shift(s[pos++]);
-          lastShift = true;
           continue;
         }
       }
       uint32_t len = f.len(s + pos);
       if (len > limit - pos) break;
       pos += len;
-      lastShift = false;
+      kept = pos;
     }
-    if (lastShift) --pos;  // never end on a dangling shift byte
+    pos = kept;
   }
+  if (pos == 0) pre = 0;  // nor on the seam's shift byte alone
   moveUnits(dst + pre, s, pos);
   if (!chars) return static_cast<int32_t>(pre + pos);
   F counted = start;
@@ -125,16 +125,20 @@ int32_t cat(F f, F dstF, U<F> *dst, const U<F> *src, int32_t srcLen, uint32_t op
       ++src;
       --n;
     }
-    if (dstCur != f.state) dst[dlen++] = f.state ? f.so : f.si;
+    const bool seam = dstCur != f.state;
+    if (seam) dst[dlen++] = f.state ? f.so : f.si;
     moveUnits(dst + dlen, src, n);
-    Walk<F> w{f, dst + dlen, n};
-    uint32_t at, len;
-    while (w.next(at, len)) {
-    }
-    dlen += n;
-    uint32_t endState = w.f.state;
-    if (dlen && f.isShift(dst[dlen - 1])) {
-      endState = dst[dlen - 1] == f.si ? 1 : 0;
+    // Never end on shift bytes, however many src ends with (nor on the seam's alone).
+    while (n && f.isShift(dst[dlen + n - 1])) --n;
+    uint32_t endState = dstCur;
+    if (n) {
+      Walk<F> w{f, dst + dlen, n};
+      uint32_t at, len;
+      while (w.next(at, len)) {
+      }
+      endState = w.f.state;
+      dlen += n;
+    } else if (seam) {
       --dlen;
     }
     if (term) {

@@ -35,7 +35,7 @@ Page singleByte() {  // ASCII and e-acute; only the first Unicode row maps back
 // even and lower-case odd trail bytes.
 Page doubleByte(bool bounded) {
   Page p;
-  p.maxLen = 2;
+  p.maxLen = 4;  // index kinds 2 and 3 below give three- and four-byte characters
   for (int b = 0x81; b <= 0x84; ++b) p.len[b] = 2;
   auto lo = [=](uint8_t v) { return bounded ? v : uint8_t{0}; };
   auto hi = [=](uint8_t v) { return bounded ? v : uint8_t{0xFF}; };

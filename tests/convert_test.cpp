@@ -131,6 +131,10 @@ TEST_F(Convert, StringMembersLimitsAndEndings) {
        "a" + kSjisKanji2, 5, 7, 8, 0, true, 6, "\x81\x0E\x45\x41\x0F" + Bytes("\0", 1)},
       {"only Shift-Out before the dropped character: it goes too", &Convert::ebcdic_, &Convert::dbcs_,
        "a" + kSjisKanji2, 5, 5, 8, 0, true, 2, Bytes("\x81\0", 2)},
+      {"exactly full, no terminator asked: the run stays open", &Convert::ebcdic_, &Convert::dbcs_,
+       "a" + kSjisKanji2, -1, 6, 0, 0, true, 6, "\x81\x0E" + kEbcdicKanji2},
+      {"one byte short of Shift-In and 0: the run stays open", &Convert::ebcdic_, &Convert::dbcs_,
+       "a" + kSjisKanji2, -1, 7, 0, 0, true, 6, "\x81\x0E" + kEbcdicKanji2},
       {"plain member ignores shift state", &Convert::latin_, &Convert::ebcdic_, "\x0E\x81", 2, 10, 0, 0, false, 2,
        "\x1A" "a"},
       {"Ex member reads the runs", &Convert::dbcs_, &Convert::ebcdic_, "\x81\x0E" + kEbcdicKanji2 + "\x0F\x82", 8, 10,
@@ -460,6 +464,91 @@ TEST(ConvertTool, ErrorsLikeIconv) {
   std::ifstream err(tmp.file("err"));
   std::string msg((std::istreambuf_iterator<char>(err)), {});
   EXPECT_NE(msg.find("byte offset 2"), std::string::npos) << msg;
+}
+
+// Runs a shell command with its output in files; the exit status, stdout and stderr.
+struct Ran {
+  int status;
+  Bytes out, err;
+};
+Ran run(const ts::TempDir &tmp, const std::string &cmd) {
+  int st = std::system((cmd + " >" + tmp.file("out") + " 2>" + tmp.file("err")).c_str());
+  auto slurp = [](const std::string &path) {
+    std::ifstream in(path, std::ios::binary);
+    return Bytes((std::istreambuf_iterator<char>(in)), {});
+  };
+  return {WEXITSTATUS(st), slurp(tmp.file("out")), slurp(tmp.file("err"))};
+}
+
+// The position iconv names in its message, as our "byte offset N"; empty when it names none.
+std::string offsetOf(const Bytes &iconvErr) {
+  size_t at = iconvErr.find("position ");
+  if (at == Bytes::npos) return "";
+  size_t from = at + 9, to = iconvErr.find_first_not_of("0123456789", from);
+  return "byte offset " + iconvErr.substr(from, to - from);
+}
+
+// Text iconv converts exactly, or refuses at the same byte, or drops with -c: the tool does
+// the same, with the same output before the stop and the same exit status.
+TEST(ConvertTool, InvalidAndUnconvertibleTextLikeIconv) {
+  if (!std::filesystem::exists(std::string(VL_TEST_DEFS_DIR) + "/control.nls")) GTEST_SKIP();
+  ts::TempDir tmp;
+  const std::string tool = std::string(VL_TEST_TLX) + " convert --dir " + VL_TEST_DEFS_DIR;
+  struct Case {
+    const char *what;
+    Bytes in;
+    const char *from, *to;
+  } cases[] = {
+      {"emoji between letters", "a\xF0\x9F\x98\x80" "b", "UTF-8", "UTF-16LE"},
+      {"emoji stays itself", "a\xF0\x9F\x98\x80" "b", "UTF-8", "UTF-8"},
+      {"rare ideograph, big-endian", "\xF0\xA0\x80\x8B", "UTF-8", "UTF-16BE"},
+      {"surrogate pair to UTF-8", Bytes("a\0\x3D\xD8\x00\xDE" "b\0", 8), "UTF-16LE", "UTF-8"},
+      {"unpaired high surrogate", Bytes("a\0\x3D\xD8" "b\0", 6), "UTF-16LE", "UTF-8"},
+      {"unpaired low surrogate", Bytes("a\0\x00\xDE" "b\0", 6), "UTF-16LE", "UTF-8"},
+      {"high surrogate at the end", Bytes("a\0\x3D\xD8", 4), "UTF-16LE", "UTF-8"},
+      {"bytes that are never UTF-8", "a\xFF\xFE" "b", "UTF-8", "UTF-16LE"},
+      {"overlong slash", "a\xC0\xAF" "b", "UTF-8", "UTF-16LE"},
+      {"overlong three bytes", "a\xE0\x80\xAF" "b", "UTF-8", "UTF-16LE"},
+      {"encoded surrogate", "a\xED\xA0\x80" "b", "UTF-8", "UTF-16LE"},
+      {"past U+10FFFF", "a\xF4\x90\x80\x80" "b", "UTF-8", "UTF-16LE"},
+      {"truncated inside", "a\xE2\x82" "b", "UTF-8", "UTF-16LE"},
+      {"truncated at the end", "ab\xE2\x82", "UTF-8", "UTF-16LE"},
+      {"emoji into a single-byte page", "a\xF0\x9F\x98\x80" "b", "UTF-8", "CP1252"},
+      {"a letter the page lacks", "x\xE3\x81\x82y", "UTF-8", "CP1252"},
+      {"Japanese into a shift page", "a\xE6\x97\xA5\xE6\x9C\xAC" "b", "UTF-8", "IBM930"},
+      {"emoji into a shift page", "\xE6\x97\xA5\xF0\x9F\x98\x80", "UTF-8", "IBM930"},
+      {"invalid double-byte pair", "a\x81\x20" "b", "CP932", "UTF-8"},
+  };
+  for (const Case &c : cases) {
+    std::ofstream(tmp.file("in"), std::ios::binary) << c.in;
+    int stopped = 0;
+    for (const char *drop : {"", "-c "}) {
+      SCOPED_TRACE(std::string(c.what) + " " + drop);
+      std::string args = std::string(drop) + "-f " + c.from + " -t " + c.to + " " + tmp.file("in");
+      Ran theirs = run(tmp, "iconv " + args), mine = run(tmp, tool + " " + args);
+      EXPECT_EQ(hex(mine.out), hex(theirs.out));
+      // Dropping changes the text, so -c still ends with 1 (older iconv says 0 there).
+      if (*drop)
+        EXPECT_EQ(mine.status, stopped) << mine.err;
+      else
+        EXPECT_EQ(mine.status, stopped = theirs.status) << mine.err;
+      EXPECT_NE(mine.err.find(offsetOf(theirs.err)), Bytes::npos) << mine.err << " / " << theirs.err;
+    }
+  }
+  // Asked for, the target's own substitution character stands in (U+FFFD in UTF-16).
+  std::ofstream(tmp.file("in"), std::ios::binary) << "a\xF0\x9F\x98\x80" "b\xFF";
+  Ran sub = run(tmp, tool + " --substitute -f UTF-8 -t CP1252 " + tmp.file("in"));
+  EXPECT_EQ(sub.status, 0);
+  EXPECT_EQ(hex(sub.out), hex("a\x1A" "b\x1A"));
+  sub = run(tmp, tool + " --substitute -f UTF-8 -t UTF-16LE " + tmp.file("in"));
+  EXPECT_EQ(hex(sub.out), hex(Bytes("a\0\x3D\xD8\x00\xDE" "b\0\xFD\xFF", 10)));
+  // The bare Windows number of UTF-8 is a name too; without definitions the tool says so.
+  EXPECT_EQ(run(tmp, tool + " -f 65001 -t UTF-16LE " + tmp.file("in") + " --substitute").status, 0);
+  Ran none = run(tmp, std::string(VL_TEST_TLX) + " convert --dir " + tmp.file("nowhere") + " -f UTF-8 -t 1252 " +
+                          tmp.file("in"));
+  EXPECT_EQ(none.status, 1);
+  EXPECT_NE(none.err.find("no definitions found"), Bytes::npos) << none.err;
+  EXPECT_NE(none.err.find(tmp.file("nowhere")), Bytes::npos) << none.err;
 }
 
 }  // namespace

@@ -74,27 +74,47 @@ TEST(Paths, DataLocation) {
 
 TEST(Files, TemporaryReplacementAndDiscard) {
   ts::TempDir d;
-  std::string x = d.file("x.nls");
-  std::ofstream(x) << "old";
-  uint32_t rc = 99;
-  for (int discard : {1, 0}) {
-    VLFile *f = VLOpenFile(1, x.c_str(), VL_FILE_WRITE, 0, &rc);
-    ASSERT_NE(f, nullptr);
-    EXPECT_EQ(rc, 0u);
-    char b[4];
-    EXPECT_EQ(VLReadFile(f, b, 1, &rc), 0);
-    EXPECT_EQ(rc, VL_RC_FILE_WRITEONLY);
-    ASSERT_EQ(write(f->descriptor, "new", 3), 3);
-    // The named file is intact until the close.
-    EXPECT_EQ(ts::readFile(x).size(), 3u);
-    struct stat st;
-    EXPECT_EQ(stat(d.file("xtmp").c_str(), &st), 0);
-    EXPECT_EQ(VLCloseFile(f, discard), 0);
-    EXPECT_NE(stat(d.file("xtmp").c_str(), &st), 0);
-    ts::Bytes bytes = ts::readFile(x);
-    std::string got(bytes.begin(), bytes.end());
-    EXPECT_EQ(got, discard ? "old" : "new");
+  // A directory part past 255 characters, made of names the file system takes.
+  std::string deep = d.path;
+  while (deep.size() <= 300) {
+    deep += "/" + std::string(60, 'd');
+    ASSERT_EQ(mkdir(deep.c_str(), 0755), 0);
   }
+  struct Case {
+    const char *what;
+    std::string file, temp;  // the named file and the temporary beside it
+  } cases[] = {
+      {"short name", d.file("x.nls"), d.file("xtmp")},
+      {"base name of 20 characters", d.file("abcdefghijklmnopqrst.nls"), d.file("abcdefghijklmnopqrsttmp")},
+      {"no extension", d.file("plain"), d.file("plaintmp")},
+      {"directory past 255 characters", deep + "/x.nls", deep + "/xtmp"},
+  };
+  for (const Case &c : cases) {
+    std::ofstream(c.file) << "old";
+    uint32_t rc = 99;
+    for (int discard : {1, 0}) {
+      VLFile *f = VLOpenFile(1, c.file.c_str(), VL_FILE_WRITE, 0, &rc);
+      ASSERT_NE(f, nullptr) << c.what;
+      EXPECT_EQ(rc, 0u);
+      char b[4];
+      EXPECT_EQ(VLReadFile(f, b, 1, &rc), 0);
+      EXPECT_EQ(rc, VL_RC_FILE_WRITEONLY);
+      ASSERT_EQ(write(f->descriptor, "new", 3), 3);
+      // The named file is intact until the close.
+      EXPECT_EQ(ts::readFile(c.file).size(), 3u) << c.what;
+      struct stat st;
+      EXPECT_EQ(stat(c.temp.c_str(), &st), 0) << c.what;
+      EXPECT_EQ(VLCloseFile(f, discard), 0);
+      EXPECT_NE(stat(c.temp.c_str(), &st), 0) << c.what;
+      ts::Bytes bytes = ts::readFile(c.file);
+      std::string got(bytes.begin(), bytes.end());
+      EXPECT_EQ(got, discard ? "old" : "new") << c.what;
+    }
+  }
+  // Nothing was left in the current directory.
+  struct stat st;
+  EXPECT_NE(stat("xtmp", &st), 0);
+  uint32_t rc = 0;
   EXPECT_EQ(VLOpenFile(1, d.file("missing").c_str(), VL_FILE_READ, 0, &rc), nullptr);
   EXPECT_EQ(rc, VL_RC_FILE_MISSING);
 }

@@ -216,8 +216,15 @@ void Queries() {
   EXPECT_EQ(rc, 0u);
   EXPECT_EQ(NLS1_GetCodepageId("EBCDIC-X", &rc), 0u);
   EXPECT_EQ(rc, VL_RC_NOTFOUND);
+  // Binary order has id 0 and the name "Binary" both ways, without an error.
   EXPECT_EQ(NLS1_GetSortId("Binary", &rc), 0u);
+  EXPECT_EQ(rc, 0u);
+  EXPECT_EQ(NLS1_GetSortId("NoSuchOrder", &rc), 0u);
   EXPECT_EQ(rc, VL_RC_NOTFOUND);
+  char sortName[8];
+  EXPECT_EQ(NLS1_GetSortName(0, sortName, sizeof sortName), 0u);
+  EXPECT_STREQ(sortName, "Binary");
+  EXPECT_EQ(NLS1_GetSortName(0, sortName, 6), VL_RC_BUFFER);
 
   struct Case {
     uint32_t localeId, codePage, rc;
@@ -389,6 +396,47 @@ void ManyThreads() {
   EXPECT_EQ(gLive.load(), 0) << "blocks left behind by ended threads";
 }
 
+// Threads that make their first translation and set their first Japanese locale at the
+// same moment each see what one thread sees once everything is loaded.
+void FirstUse() {
+  const std::string text = "\xE4\xB8\xAD\xE6\x96\x87 GBK \xE6\xB1\x89\xE5\xAD\x97 \xEF\xBF\xA5";
+  std::string gbk, want;
+  ASSERT_TRUE(iconvTo(text, "UTF-8", "CP936", &gbk) && iconvTo(text, "UTF-8", "UTF-16LE", &want));
+  uint32_t rc = 0;
+  const uint32_t japanese = NLS1_LOCALE_ID(NLS1_GetLanguageId("Japanese", &rc), NLS1_GetTerritoryId("Japan", &rc));
+  ASSERT_EQ(rc, 0u);
+  auto items = [] {
+    std::string all;
+    char buf[128];
+    for (int item = 1; item <= VL_ITEM_LAST; ++item) {
+      int32_t n = NLS1_GetLocaleTextInfo(nullptr, item, buf, sizeof buf, 0);
+      all += std::string(buf, static_cast<size_t>(n > 0 ? n : 0)) + "|";
+    }
+    return all;
+  };
+  constexpr size_t kThreads = 8;
+  std::atomic<size_t> waiting{kThreads};
+  std::vector<Result> got(kThreads);
+  std::vector<std::string> seen(kThreads);
+  std::vector<std::thread> threads;
+  for (size_t k = 0; k < kThreads; ++k)
+    threads.emplace_back([&, k] {
+      waiting.fetch_sub(1);
+      while (waiting.load()) {
+      }
+      got[k] = translate(1200, 936, gbk, static_cast<int32_t>(gbk.size()), 64, 0);
+      if (NLS1_SetLocale(japanese, 954, NLS1_SET_THREAD) == 0) seen[k] = items();
+    });
+  for (auto &th : threads) th.join();
+  ASSERT_EQ(NLS1_SetLocale(japanese, 954, NLS1_SET_THREAD), 0u);
+  const std::string one = items();
+  for (size_t k = 0; k < kThreads; ++k) {
+    EXPECT_EQ(got[k].rc, 0u) << k;
+    EXPECT_EQ(got[k].out, want) << k;
+    EXPECT_EQ(seen[k], one) << k;
+  }
+}
+
 // The child suites exist only in the child that runs them.
 struct ChildCase {
   const char *name;
@@ -398,7 +446,7 @@ const ChildCase kChildCases[] = {
     {"Translate", TranslateAgreesWithIconv}, {"TranslateRules", TranslateRules},
     {"Missing", MissingFileUsesBuiltin},     {"Queries", Queries},
     {"Locales", ThreadAndProcessLocales},    {"Fallback", FallbackWithoutDefinitions},
-    {"Threads", ManyThreads},
+    {"Threads", ManyThreads},                {"FirstUse", FirstUse},
 };
 
 class ChildTest : public ::testing::Test {
@@ -458,6 +506,12 @@ TEST(ServiceThreads, ManyThreadsTranslateAndChangeTheirOwnLocales) {
   if (std::getenv(kChildVar)) GTEST_SKIP() << "inside a child";
   if (!haveDefs()) GTEST_SKIP() << "no generated definitions";
   EXPECT_EQ(runChild("Threads", {{"NLS1_LOCALEDIR", VL_TEST_DEFS_DIR}, {"VL_LANG", "English"}}), 0);
+}
+
+TEST(ServiceThreads, FirstUseFromManyThreadsAtOnce) {
+  if (std::getenv(kChildVar)) GTEST_SKIP() << "inside a child";
+  if (!haveDefs()) GTEST_SKIP() << "no generated definitions";
+  EXPECT_EQ(runChild("FirstUse", {{"NLS1_LOCALEDIR", VL_TEST_DEFS_DIR}, {"VL_LANG", "English"}}), 0);
 }
 
 }  // namespace

@@ -254,6 +254,10 @@ TEST(Step, FindsLineEnds) {
       {kSingle, "a\nb", 0x0300 | 0x1000, VL_EOL_BADOPTION, 0, -1, 2},
       {kDouble, B("\x81\x0A\n"), VL_EOL_LF, VL_EOL_LF, 1, 3, 0},  // a trail byte is no line feed
       {kShift, B("\x0E\x45\x25\x0F\x25"), VL_EOL_LF, VL_EOL_LF, 1, 5, 0},
+      // The character-count bit is taken whatever the length.
+      {kSingle, "ab\ncd", VL_EOL_LF | VL_OPT_CHARLEN, VL_EOL_LF, 1, 3, 0, -1},
+      {kSingle, "ab\ncd", VL_EOL_LF | VL_OPT_CHARLEN, VL_EOL_NOTFOUND, 0, -1, 0, 0},
+      {kShift, B("\x0E\x45\x25\x0F\x25"), VL_EOL_LF | VL_OPT_CHARLEN, VL_EOL_LF, 1, 5, 0, -1},
   };
   for (const Case &c : cases) {
     VLLocale *l = locale(c.kind);

@@ -43,6 +43,9 @@ TEST(String, CopiesWholeCharactersOnly) {
       {kShift, "ab", 2, 3, 0, 3, B("\x0F" "ab"), 0, 1},
       {kShift, B("\x0E" "ab"), 3, 10, 0, 2, "ab", 0, 1},
       {kShift, B("\x0E\x45\x41\x45\x42\x0F"), 1, 10, VL_OPT_CHARLEN, 1, B("\x0E\x45\x41")},
+      // However many shift bytes the source ends with.
+      {kShift, B("\xC1\x0E\x0F"), 3, 10, 0, 1, "\xC1"},
+      {kShift, B("\xC1\x0E\x0F\x0E"), 4, 10, 0, 1, "\xC1"},
   };
   for (size_t i = 0; i < cases.size(); ++i) {
     const CopyCase &c = cases[i];
@@ -99,6 +102,9 @@ TEST(String, Concatenates) {
       {kShift, "a", B("\x45\x42"), 2, 0, 4, B("a\x0E\x45\x42"), 1},
       {kShift, "a", B("\x0E"), -1, 0, 2, B("a\0")},
       {kShift, B("a\x0E\x45\x41\x0F"), "b", -1, 0, 7, B("a\x0E\x45\x41\x0F" "b\0")},
+      // The appended part never ends on shift bytes, however many src ends with.
+      {kShift, "\xC1", B("\xC2\x0E\x0F"), 3, 0, 2, "\xC1\xC2"},
+      {kShift, "\xC1", B("\xC2\x0E\x0F"), -1, 0, 3, B("\xC1\xC2\0")},
   };
   for (size_t i = 0; i < cases.size(); ++i) {
     const CatCase &c = cases[i];

@@ -58,7 +58,7 @@ const std::vector<CodePageDef> &codeCodePageDefs() {
       {950, "MS950", "CP950", false, false, {"CP950", "BIG5", "BIG-5", "WINDOWS-950", "950"}},
       {970, "EUC-KR", "EUC-KR", false, false, {"EUCKR", "IBM-970", "970"}},
       {964, "EUC-TW", "EUC-TW", false, false, {"EUCTW", "IBM-964", "964"}},
-      {57352, "UTF-8", "UTF-8", false, false, {"UTF8", "CP65001", "IBM-1208", "1208"}},
+      {57352, "UTF-8", "UTF-8", false, false, {"UTF8", "CP65001", "65001", "IBM-1208", "1208"}},
       {930, "IBM930", "IBM930", true, true, {"CP930", "IBM-930", "930"}},
       {939, "IBM939", "IBM939", true, true, {"CP939", "IBM-939", "939"}},
       {933, "IBM933", "IBM933", true, true, {"CP933", "IBM-933", "933"}},
