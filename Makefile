@@ -40,6 +40,7 @@ test: build asan
 
 bench: build
 	$(BUILD)/tlx_bench
+	$(BUILD)/tlx_time_bench
 
 clean:
 	rm -rf $(BUILD) $(ASAN_BUILD) $(TSAN_BUILD)

@@ -16,6 +16,7 @@ const Command kCommands[] = {
     {"locale", cmdLocale, "locale NAME [--dir DIR]      build a locale and show what it is made of"},
     {"convert", cmdConvert, "convert -f FROM -t TO [FILE...]  convert text between code pages"},
     {"info", cmdInfo, "info LOCALE [--items N,...] [--defaults]  show the information items of a locale"},
+    {"date", cmdDate, "date [--locale NAME] [--format P|--short|--long|--time] [--parse TEXT]  write or read a time"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
 };
 
