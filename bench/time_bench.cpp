@@ -1,7 +1,7 @@
 // Writing and reading a full date and time: this library against the C library's
 // strftime/strptime in the same locale and ICU's udat_format/udat_parse, same times, same
-// run. A summary after the run gives nanoseconds a call and the ratio to each peer
-// (above 1: this library is faster).
+// run. A summary after the run gives CPU nanoseconds a call (the machine may be shared)
+// and the ratio to each peer (above 1: this library is faster).
 #include <benchmark/benchmark.h>
 #include <locale.h>
 #include <unicode/udat.h>
@@ -161,12 +161,12 @@ class Summary : public benchmark::ConsoleReporter {
       std::string name = r.benchmark_name();
       size_t slash = name.rfind('/');
       std::string row = name.substr(0, slash);
-      rows_[row][name.substr(slash + 1)] = r.GetAdjustedRealTime();
+      rows_[row][name.substr(slash + 1)] = r.GetAdjustedCPUTime();
       if (std::find(order_.begin(), order_.end(), row) == order_.end()) order_.push_back(row);
     }
   }
   void print() const {
-    std::printf("\n%-22s %9s %9s %9s %9s %9s\n", "row (ns a call)", "veltrin", "libc", "icu", "vs libc", "vs icu");
+    std::printf("\n%-22s %9s %9s %9s %9s %9s\n", "row (CPU ns a call)", "veltrin", "libc", "icu", "vs libc", "vs icu");
     for (const std::string &row : order_) {
       const auto &m = rows_.at(row);
       auto get = [&](const char *k) { return m.count(k) ? m.at(k) : 0.0; };
