@@ -2,6 +2,8 @@
 // compared character by character, each side following its own shift bytes, so text a
 // formatter wrote with its shift bytes placed differently from the pattern's still reads.
 #pragma once
+#include <algorithm>
+
 #include "format/timefam.h"
 
 namespace vl::tf {
@@ -42,7 +44,7 @@ uint32_t readNumber(In<F> &in, U<F> zero, uint32_t width, int32_t max, int32_t *
   for (; k < width && probe.pos < probe.n; ++k, ++probe.pos) {
     const uint32_t u = probe.s[probe.pos];
     if (u < zero || u > zero + 9u) break;
-    v = v * 10 + (u - zero);
+    v = std::min<int64_t>(v * 10 + (u - zero), INT64_C(1) << 40);  // a caller's width may be huge
   }
   if (k == 0 || v > max) return VL_RC_NOTFOUND;
   in = probe;

@@ -160,6 +160,7 @@ TEST_F(TimeParse, WordsTheLongestMatchAndTheFirstOfEquals) {
       {"no digit", "x", 2, 59, 1, 37, -1, 0},
       {"EBCDIC digits", "\xF4\xF2", 2, 99, 0, 0, 42, 2},
       {"ASCII digits are not EBCDIC ones", "42", 2, 99, 0, 37, -1, 0},
+      {"a huge width still stops at the maximum", "99999999999999999999999", 1 << 30, 99, 1, 37, -1, 0},
   };
   for (const Num &c : nums) {
     uint32_t error = 99;
