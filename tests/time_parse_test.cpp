@@ -274,6 +274,23 @@ TEST_F(TimeParse, RandomPatternsAndTextAreSurvived) {
         std::tm back{};
         VLStringToTimeEx(l, &back, out.get(), 0, n, pat.get(), b, static_cast<int32_t>(pl), 0);
       }
+      // The unit forms and the one-directive members over the same bytes as units.
+      std::unique_ptr<VLWChar[]> pw(new VLWChar[pl]), iw(new VLWChar[il]), ow(new VLWChar[size + 1]);
+      std::unique_ptr<VLUChar[]> pu(new VLUChar[pl]), iu(new VLUChar[il]), ou(new VLUChar[size + 1]);
+      for (size_t k = 0; k < pl; ++k) pw[k] = pu[k] = static_cast<unsigned char>(pat[k]);
+      for (size_t k = 0; k < il; ++k) iw[k] = iu[k] = static_cast<unsigned char>(in[k]);
+      const int32_t sz = static_cast<int32_t>(size), pn = static_cast<int32_t>(pl), in_ = static_cast<int32_t>(il);
+      EXPECT_LE(VLTimeToStringW(l, &t, ow.get(), sz, pw.get(), pn, opts), sz);
+      EXPECT_LE(VLTimeToStringU(l, &t, ou.get(), sz, pu.get(), pn, opts), sz);
+      EXPECT_LE(VLStringToTimeW(l, &t, iw.get(), in_, pw.get(), pn, 0), in_);
+      EXPECT_LE(VLStringToTimeU(l, &t, iu.get(), in_, pu.get(), pn, 0), in_);
+      int32_t pos = 0, pp = static_cast<int32_t>(rng() % (pl + 1)), ip = 0, pm = 0;
+      VLShiftState st = a;
+      if (pp < pn) VLStrExpandTimeEx(l, &t, out.get(), &pos, &st, static_cast<int32_t>(size), pat.get(), &pp, pn, 0);
+      EXPECT_LE(pos, static_cast<int32_t>(size));
+      pp = static_cast<int32_t>(rng() % (pl + 1));
+      if (pp < pn) VLStrExtractTimeEx(l, &t, &pm, in.get(), &ip, &st, in_, pat.get(), &pp, pn, 0);
+      EXPECT_LE(ip, in_);
     }
   }
 }
