@@ -56,6 +56,7 @@ test: build asan
 
 bench: build
 	$(BUILD)/tlx_bench
+	$(BUILD)/tlx_time_bench
 
 # The library, headers, tool, pkg-config and CMake package files and the definitions,
 # under $(DESTDIR)$(PREFIX); the built-in definitions location is linked to them.

@@ -232,5 +232,6 @@ VL_API void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, u
 #include "veltrin/vlnative.h"
 #include "veltrin/vlstream.h"
 #include "veltrin/vlcatalog.h"
+#include "veltrin/vltime.h"
 
 #endif /* VELTRIN_H */

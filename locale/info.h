@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <cstring>
 
+#include "codepage/cpprim.h"
 #include "locale/locale.h"
 
 namespace vl::info {
@@ -228,7 +229,7 @@ void emitChars(const VLLocale *l, const Item &it, Out &out) {
   if (it.kind == VL_ITEMKIND_UTF16) {
     const auto *u = static_cast<const VLUChar *>(it.p);
     for (size_t i = 0; !(it.single && i > 0) && u[i]; ++i) {
-      p.n = static_cast<unsigned>(VLCpUnicodeToChar(c, u[i], p.b));
+      p.n = static_cast<unsigned>(cp::uniToMb(c, u[i], p.b));  // inline: getters run per name
       if (!p.n || p.n > 4 || !out.put(p)) return;
     }
   } else if (it.kind == VL_ITEMKIND_CP) {
@@ -249,7 +250,7 @@ void emitChars(const VLLocale *l, const Item &it, Out &out) {
         p = {{s[i]}, 1};
       } else {
         VLUChar u = ascii ? cp::sbcsUni(ascii, s[i]) : s[i];
-        p.n = static_cast<unsigned>(VLCpUnicodeToChar(c, u, p.b));
+        p.n = static_cast<unsigned>(cp::uniToMb(c, u, p.b));
         if (!p.n || p.n > 4) return;
       }
       if (!out.put(p)) return;

@@ -70,7 +70,19 @@ bool parseItems(const char *s, std::vector<int> *out) {
   return !out->empty();
 }
 
-// UTF-16 for the terminal: UTF-8 when it takes UTF-8, else ASCII with \u escapes.
+void help(FILE *out) {
+  std::fprintf(out,
+               "usage: tlx info LOCALE [--items N,...] [--defaults] [--user] [--dir DIR]\n"
+               "  Prints the information items of LOCALE (language_territory.codepage@sort), numbered\n"
+               "  and named. --items picks items (1-88, ranges like 16-22); --defaults shows the\n"
+               "  territory's defaults instead of the handle's values; --user builds the user's\n"
+               "  locale (VL_LANG, else the platform's) in place of LOCALE. Items the handle\n"
+               "  overrides are marked '*'. Texts are shown in UTF-8 on a UTF-8 terminal, else as\n"
+               "  ASCII with \\uXXXX escapes.\n");
+}
+
+}  // namespace
+
 std::string forTerminal(const VLUChar *u, bool utf8) {
   std::string s;
   for (; *u; ++u) {
@@ -92,19 +104,6 @@ std::string forTerminal(const VLUChar *u, bool utf8) {
   }
   return s;
 }
-
-void help(FILE *out) {
-  std::fprintf(out,
-               "usage: tlx info LOCALE [--items N,...] [--defaults] [--user] [--dir DIR]\n"
-               "  Prints the information items of LOCALE (language_territory.codepage@sort), numbered\n"
-               "  and named. --items picks items (1-88, ranges like 16-22); --defaults shows the\n"
-               "  territory's defaults instead of the handle's values; --user builds the user's\n"
-               "  locale (VL_LANG, else the platform's) in place of LOCALE. Items the handle\n"
-               "  overrides are marked '*'. Texts are shown in UTF-8 on a UTF-8 terminal, else as\n"
-               "  ASCII with \\uXXXX escapes.\n");
-}
-
-}  // namespace
 
 int cmdInfo(int argc, char **argv) {
   const char *name = nullptr, *dir = nullptr;

@@ -18,6 +18,7 @@ const Command kCommands[] = {
     {"info", cmdInfo, "info LOCALE [--items N,...] [--defaults]  show the information items of a locale"},
     {"gencat", cmdGencat, "gencat [--locale NAME] OUTPUT.cat SOURCE.msg...  compile message sources"},
     {"catalog", cmdCatalog, "catalog FILE.cat            list a catalog as message source"},
+    {"date", cmdDate, "date [--locale NAME] [--format P|--short|--long|--time] [--parse TEXT]  write or read a time"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
 };
 
