@@ -1,11 +1,21 @@
 /* Part of the Veltrin interface; include <veltrin.h>.
-   Case, width and digit mapping: the built-in Unicode tables and the unit mappings. */
+   Case, width and digit mapping: the built-in Unicode tables, the unit mappings and the
+   four forms of VLMapString. */
 #ifndef VELTRIN_VLMAP_H
 #define VELTRIN_VLMAP_H
 
 #ifdef __cplusplus
 extern "C" {
 #endif
+
+/* Selectors of the VLMapString family. VL_OPT_CHARLEN may be added to the byte form's. */
+#define VL_MAP_COPY      0x80000023u
+#define VL_MAP_FULLWIDTH 0x80000021u
+#define VL_MAP_HALFWIDTH 0x80000022u
+#define VL_MAP_LOWER     0x80000024u
+#define VL_MAP_UPPER     0x80000025u
+#define VL_MAP_NOSPECIAL 0x00002000u /* with VL_MAP_LOWER or VL_MAP_UPPER: simple mapping only */
+#define VL_MAP_DIGITS    0x00000010u
 
 /* Each table covers FIRST..LAST; entry i belongs to the unit BASE + i. */
 #define VL_UNICODE_LOWER1_BASE 0x0100u
@@ -93,6 +103,17 @@ VL_API VLUChar VLUnicodeToLower(VLLocale *locale, VLUChar unit);
 VL_API VLUChar VLUnicodeToUpper(VLLocale *locale, VLUChar unit);
 VL_API VLUChar VLUnicodeToH2F(VLLocale *locale, VLUChar unit);
 VL_API VLUChar VLUnicodeToF2H(VLLocale *locale, VLUChar unit);
+
+/* Copies a string while mapping it; the result counts what was written, -1 for a bad
+   selector (lastError 2). A negative input length maps the terminating 0 too. */
+VL_API int32_t VLMapString(VLLocale *locale, char *out, int32_t outLen, const char *in, int32_t inLen,
+                           uint32_t selector);
+VL_API int32_t VLMapStringEx(VLLocale *locale, char *out, int32_t outLen, const char *in, VLShiftState state,
+                             int32_t inLen, uint32_t selector);
+VL_API int32_t VLMapStringW(VLLocale *locale, VLWChar *out, int32_t outLen, const VLWChar *in, int32_t inLen,
+                            uint32_t selector);
+VL_API int32_t VLMapStringU(VLLocale *locale, VLUChar *out, int32_t outLen, const VLUChar *in, int32_t inLen,
+                            uint32_t selector);
 
 #ifdef __cplusplus
 }
