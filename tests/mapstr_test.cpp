@@ -3,9 +3,13 @@
 // every generated code page.
 #include <gtest/gtest.h>
 
+#include <unistd.h>
+#include <sys/wait.h>
+
 #include <array>
 #include <cstring>
 #include <filesystem>
+#include <fstream>
 #include <string>
 #include <vector>
 
@@ -327,6 +331,114 @@ TEST_F(MapString, EveryFormAgreesWithUnicodeOnEveryPage) {
   EXPECT_GT(pages, 20u);
   EXPECT_GT(checked, 100000u);
   RecordProperty("page_decides", static_cast<int>(pageDecides));
+}
+
+}  // namespace
+
+namespace {
+
+struct ToolRun {
+  int status;
+  std::string out, err;
+};
+
+// A file under /tmp removed afterwards.
+struct TempFile {
+  std::string path;
+  explicit TempFile(const std::string &content) {
+    char p[] = "/tmp/maptestXXXXXX";
+    int fd = mkstemp(p);
+    path = p;
+    EXPECT_EQ(write(fd, content.data(), content.size()), static_cast<ssize_t>(content.size()));
+    close(fd);
+  }
+  ~TempFile() { std::remove(path.c_str()); }
+};
+
+// Runs tlx map with the generated definitions; redirect is appended to the command line.
+ToolRun runMap(const std::string &args, const std::string &redirect = "") {
+  TempFile err("");
+  const std::string cmd =
+      std::string(VL_TEST_TLX) + " map --dir " + VL_TEST_DEFS_DIR + " " + args + " " + redirect + " 2>" + err.path;
+  ToolRun r;
+  FILE *p = popen(cmd.c_str(), "r");
+  char buf[4096];
+  size_t n;
+  while (p && (n = std::fread(buf, 1, sizeof buf, p)) > 0) r.out.append(buf, n);
+  r.status = p ? WEXITSTATUS(pclose(p)) : -1;
+  std::ifstream e(err.path);
+  r.err.assign(std::istreambuf_iterator<char>(e), {});
+  return r;
+}
+
+// Lines of mixed text, long enough for several chunks, with characters of every length
+// straddling the chunk ends.
+std::string longText(const std::string &line, char lf, size_t bytes) {
+  std::string t;
+  for (size_t i = 0; t.size() < bytes; ++i) {
+    t += line;
+    if (i % 7 != 6) t += lf;  // some lines run on into the next
+  }
+  return t;
+}
+
+TEST_F(MapString, ToolStreamsLikeOneCall) {
+  struct Row {
+    const char *what;
+    const char *locale;
+    const char *option;
+    uint32_t sel;
+    std::string line;
+  };
+  const Row rows[] = {
+      {"UTF-8 upper case", "German_Germany.UTF-8", "--upper --simple", kUpperSimple,
+       "Gr\xC3\xBC\xC3\x9F" "e \xCE\xB1\xCE\xB2 \xE3\x81\x82 stra\xC3\x9F" "e"},
+      {"MS932 full width", "Japanese_Japan.MS932", "--full-width", VL_MAP_FULLWIDTH, "abc \x82\xA0\xB1 123"},
+      {"IBM930 half width", "English_UnitedStates.IBM930", "--half-width", VL_MAP_HALFWIDTH,
+       "\xC1\x0E\x42\xC1\x42\xC2\x44\x5C\x0F\xC2\x40\x0E\x42\xF1\x45\x41\x0F"},
+      {"Latin-1 digits", "German_Germany.Latin1", "--digits", VL_MAP_DIGITS, "x\xB2y\xB3 12"},
+  };
+  for (const Row &r : rows) {
+    VLLocale *l = locale(r.locale);
+    ASSERT_TRUE(l) << r.locale;
+    const std::string text = longText(r.line, static_cast<char>(vl::cp::body(l->codePage)[vl::cp::kLf]), 200 * 1024);
+    std::vector<char> want(text.size() * 6 + 16);
+    int32_t n = VLMapStringEx(l, want.data(), static_cast<int32_t>(want.size()), text.data(), 0,
+                              static_cast<int32_t>(text.size()), r.sel);
+    ASSERT_GT(n, 0) << r.what;
+    TempFile in(text);
+    ToolRun run = runMap(std::string(r.option) + " --locale " + r.locale + " " + in.path);
+    EXPECT_EQ(run.status, 0) << r.what << ": " << run.err;
+    EXPECT_TRUE(run.out == std::string(want.data(), static_cast<size_t>(n))) << r.what;
+  }
+}
+
+TEST_F(MapString, ToolCommandLine) {
+  TempFile cut("abc\xC3"), sharp("stra\xDF" "e\n"), abc("ABC\n");
+  struct Row {
+    const char *what;
+    std::string args, redirect;
+    int status;
+    std::string out, errHas;
+  };
+  const Row rows[] = {
+      {"standard input in a single-byte page", "--upper --simple --locale German_Germany.Latin1", "<" + sharp.path, 0,
+       "STRA\xDF" "E\n", ""},
+      {"a platform locale name", "--lower --locale C", "<" + abc.path, 0, "abc\n", ""},
+      {"an incomplete last character", "--upper --locale German_Germany.UTF-8 " + cut.path, "", 1, "ABC",
+       "byte offset 3"},
+      {"a missing file", "--upper --locale German_Germany.UTF-8 /nonexistent/x", "", 1, "", "/nonexistent/x"},
+      {"no mapping", "--locale German_Germany.UTF-8", "</dev/null", 2, "", "usage"},
+      {"two mappings", "--upper --lower", "</dev/null", 2, "", "one mapping"},
+      {"simple with width", "--simple --full-width", "</dev/null", 2, "", "--simple"},
+      {"an unknown locale", "--upper --locale Nowhere_Nothing.X", "</dev/null", 1, "", "no locale"},
+  };
+  for (const Row &r : rows) {
+    ToolRun run = runMap(r.args, r.redirect);
+    EXPECT_EQ(run.status, r.status) << r.what << ": " << run.err;
+    EXPECT_EQ(run.out, r.out) << r.what;
+    EXPECT_NE(run.err.find(r.errHas), std::string::npos) << r.what << ": " << run.err;
+  }
 }
 
 }  // namespace

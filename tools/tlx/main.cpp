@@ -17,6 +17,7 @@ const Command kCommands[] = {
     {"convert", cmdConvert, "convert -f FROM -t TO [FILE...]  convert text between code pages"},
     {"info", cmdInfo, "info LOCALE [--items N,...] [--defaults]  show the information items of a locale"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
+    {"map", cmdMap, "map --lower|--upper|--full-width|--half-width|--digits [--simple] [--locale NAME] [FILE...]"},
 };
 
 void usage(FILE *out) {

@@ -5,6 +5,20 @@ int cmdLocale(int argc, char **argv);
 int cmdConvert(int argc, char **argv);
 int cmdInfo(int argc, char **argv);
 int cmdTranslate(int argc, char **argv);
+int cmdMap(int argc, char **argv);
 
 // The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
 const char *defsDir(const char *given);
+
+#include <cstdio>
+
+// An input file, or standard input for null or "-"; closed when it goes. A file that
+// cannot be opened is reported under the command's name and leaves f null.
+struct Input {
+  FILE *f = nullptr;
+  const char *shown;
+  Input(const char *command, const char *path);
+  ~Input();
+  Input(const Input &) = delete;
+  Input &operator=(const Input &) = delete;
+};
