@@ -3,6 +3,7 @@
 // deltas and width tables), and a writer fits whole results into the output.
 #pragma once
 #include <cstdint>
+#include <algorithm>
 #include <cstring>
 
 #include "codepage/step.h"
@@ -36,13 +37,29 @@ inline bool parse(uint32_t selector, Sel *s) {
   }
 }
 
-// Special-case tables: 44 upper case, 45 lower case; their counts are words 3 and 4.
+// A language's special-case table (44 upper case, 45 lower case) as VLLangGetSpecial
+// reads it: count at word 3 or 4, offset at word 49 or 50, entries of four units. The
+// filter holds the first key units by their low ten bits, so most characters skip the
+// lookups.
 inline int specialTable(Op op) { return op == Op::Upper ? 44 : 45; }
-inline bool hasSpecial(const VLObjEntry *lang, int table) {
-  if (!lang) return false;
-  const auto *b = static_cast<const uint8_t *>(__atomic_load_n(&lang->section[0], __ATOMIC_ACQUIRE));
-  return b && rd16(b + (table == 44 ? 6 : 8)) != 0;
-}
+struct Special {
+  const VLObjEntry *lang;
+  int table;
+  bool active = false;
+  uint64_t bits[16] = {};
+  Special(const VLObjEntry *l, int t) : lang(l), table(t) {
+    const auto *b = l ? static_cast<const uint8_t *>(__atomic_load_n(&l->section[0], __ATOMIC_ACQUIRE)) : nullptr;
+    if (!b) return;
+    const uint16_t count = rd16(b + (t == 44 ? 6 : 8));
+    const uint8_t *e = b + rd16(b + 2 * (t + 5));
+    for (uint16_t i = 0; i < count; ++i, e += 8) {
+      const uint16_t k = rd16(e);
+      bits[(k >> 6) & 15] |= uint64_t{1} << (k & 63);
+    }
+    active = count != 0;
+  }
+  bool maybe(VLUChar u) const { return ((bits[(u >> 6) & 15] >> (u & 63)) & 1) != 0; }
+};
 
 // ---- Page policies: one character as a 32-bit value ----------------------------------
 
@@ -173,15 +190,14 @@ struct ShiftWriter {
 // ---- The mapping ----------------------------------------------------------------------
 
 template <class F, class P>
-bool specialCase(Reader<F> &r, const P &page, uint32_t v, const VLObjEntry *lang, int table, uint32_t *outv,
-                 uint32_t *k) {
+bool specialCase(Reader<F> &r, const P &page, uint32_t v, const Special &sp, uint32_t *outv, uint32_t *k) {
   VLUChar o1 = 0, o2 = 0;
   const VLUChar u = page.toUni(v);
-  int n = VLLangGetSpecial(lang, u, 0, &o1, &o2, table);
+  int n = VLLangGetSpecial(sp.lang, u, 0, &o1, &o2, sp.table);
   bool pair = false;
   uint32_t nextV;
   if (!n && r.peek(&nextV)) {
-    n = VLLangGetSpecial(lang, u, page.toUni(nextV), &o1, &o2, table);
+    n = VLLangGetSpecial(sp.lang, u, page.toUni(nextV), &o1, &o2, sp.table);
     pair = n != 0;
   }
   if (!n || !page.fromUni(o1, &outv[0]) || (n == 2 && !page.fromUni(o2, &outv[1]))) return false;
@@ -190,31 +206,52 @@ bool specialCase(Reader<F> &r, const P &page, uint32_t v, const VLObjEntry *lang
   return true;
 }
 
-// Maps r's characters into w; true when the input ran out before the output.
-template <class F, class P, class W>
-bool mapChars(Reader<F> &r, const P &page, W &w, Sel sel, const VLObjEntry *lang) {
-  const int table = specialTable(sel.op);
-  const bool special = sel.special && hasSpecial(lang, table);
+// One character by a mapping other than special casing.
+template <Op kOp, class P>
+VL_HOT uint32_t mapOne(const P &page, uint32_t v) {
+  if constexpr (kOp == Op::Full) {
+    return page.full(v);
+  } else if constexpr (kOp == Op::Half) {
+    return page.half(v);
+  } else if constexpr (kOp == Op::Lower) {
+    return page.lower(v);
+  } else if constexpr (kOp == Op::Upper) {
+    return page.upper(v);
+  } else if constexpr (kOp == Op::Digits) {
+    if (page.isDigit(v))
+      if (VLUChar d = umap::asciiDigit(page.toUni(v))) {
+        uint32_t x;
+        if (page.fromUni(d, &x)) return x;
+      }
+    return v;
+  } else {
+    return v;
+  }
+}
+
+// Maps r's characters into w; true when the input ran out before the output. sp is the
+// special-case table in use, if any.
+template <Op kOp, class F, class P, class W>
+bool mapChars(Reader<F> &r, const P &page, W &w, const Special *sp) {
+  if constexpr (F::kUnits) {
+    if (!sp) {  // one unit in, one unit out
+      Walk<F> &in = r.w;
+      const uint32_t m = std::min(in.n - in.pos, w.cap - w.pos);
+      const U<F> *s = in.s + in.pos;
+      U<F> *o = w.out + w.pos;
+      for (uint32_t i = 0; i < m; ++i) o[i] = static_cast<U<F>>(mapOne<kOp>(page, s[i]));
+      in.pos += m;
+      w.pos += m;
+      return in.pos == in.n;
+    }
+  }
   uint32_t v;
   while (r.next(&v)) {
     uint32_t outv[2] = {v, 0}, k = 1;
-    switch (sel.op) {
-      case Op::Full: outv[0] = page.full(v); break;
-      case Op::Half: outv[0] = page.half(v); break;
-      case Op::Lower:
-      case Op::Upper:
-        if (!(special && specialCase(r, page, v, lang, table, outv, &k)))
-          outv[0] = sel.op == Op::Lower ? page.lower(v) : page.upper(v);
-        break;
-      case Op::Digits:
-        if (page.isDigit(v))
-          if (VLUChar d = umap::asciiDigit(page.toUni(v))) {
-            uint32_t x;
-            if (page.fromUni(d, &x)) outv[0] = x;
-          }
-        break;
-      case Op::Copy: break;
-    }
+    bool hit = false;
+    if constexpr (kOp == Op::Lower || kOp == Op::Upper)
+      hit = sp && sp->maybe(page.toUni(v)) && specialCase(r, page, v, *sp, outv, &k);
+    if (!hit) outv[0] = mapOne<kOp>(page, v);
     if (!w.put(outv, k)) return false;
   }
   return true;
@@ -225,7 +262,17 @@ template <class F, class P, class W>
 int32_t mapString(F f, const P &page, W w, const U<F> *in, int32_t inLen, Sel sel, const VLObjEntry *lang) {
   const uint32_t n = resolveLen(in, inLen, 1);
   Reader<F> r{Walk<F>{f, in, n}};
-  const bool done = mapChars(r, page, w, sel, lang);
+  const Special sp(sel.special ? lang : nullptr, specialTable(sel.op));
+  const Special *use = sp.active ? &sp : nullptr;
+  bool done = true;
+  switch (sel.op) {
+    case Op::Full: done = mapChars<Op::Full>(r, page, w, use); break;
+    case Op::Half: done = mapChars<Op::Half>(r, page, w, use); break;
+    case Op::Lower: done = mapChars<Op::Lower>(r, page, w, use); break;
+    case Op::Upper: done = mapChars<Op::Upper>(r, page, w, use); break;
+    case Op::Digits: done = mapChars<Op::Digits>(r, page, w, use); break;
+    case Op::Copy: done = mapChars<Op::Copy>(r, page, w, use); break;
+  }
   w.finish(r.w.f.state, !done);
   return static_cast<int32_t>(w.pos);
 }

@@ -1,5 +1,5 @@
-// The unit mappings: range tests in a fixed order, the Latin ranges by arithmetic before
-// any table, then at most one table read.
+// The unit mappings: range tests, Latin-1 by arithmetic before any table, then at most one
+// table read. The ranges do not overlap, so their order only matters for speed.
 #pragma once
 #include <cstdint>
 
@@ -13,7 +13,7 @@ inline bool in(uint32_t u, uint32_t lo, uint32_t hi) { return u - lo <= hi - lo;
   if (in(u, VL_UNICODE_##T##_FIRST, VL_UNICODE_##T##_LAST)) return Name[u - VL_UNICODE_##T##_BASE]
 
 inline VLUChar toLower(VLUChar u) {
-  if (in(u, 0x41, 0x5A) || (in(u, 0xC0, 0xDE) && u != 0xD7)) return static_cast<VLUChar>(u + 0x20);
+  if (u < 0x100) return in(u, 0x41, 0x5A) || (in(u, 0xC0, 0xDE) && u != 0xD7) ? static_cast<VLUChar>(u + 0x20) : u;
   VL_UMAP_TABLE(LOWER1, VL_UNICODE_Lower1);
   VL_UMAP_TABLE(LOWER2, VL_UNICODE_Lower2);
   VL_UMAP_TABLE(LOWER3, VL_UNICODE_Lower3);
@@ -29,7 +29,10 @@ inline VLUChar toLower(VLUChar u) {
 
 // No Georgian range in this direction: the lower-case letters stay as they are.
 inline VLUChar toUpper(VLUChar u) {
-  if (in(u, 0x61, 0x7A) || (in(u, 0xE0, 0xFE) && u != 0xF7)) return static_cast<VLUChar>(u - 0x20);
+  if (u < 0x100) {
+    if (in(u, 0x61, 0x7A) || (in(u, 0xE0, 0xFE) && u != 0xF7)) return static_cast<VLUChar>(u - 0x20);
+    return u == 0xFF ? 0x178 : u;
+  }
   VL_UMAP_TABLE(UPPER1, VL_UNICODE_Upper1);
   VL_UMAP_TABLE(UPPER2, VL_UNICODE_Upper2);
   VL_UMAP_TABLE(UPPER3, VL_UNICODE_Upper3);
@@ -40,7 +43,6 @@ inline VLUChar toUpper(VLUChar u) {
   if (in(u, 0x2170, 0x217F)) return static_cast<VLUChar>(u - 0x10);
   if (in(u, 0x24D0, 0x24E9)) return static_cast<VLUChar>(u - 0x1A);
   if (in(u, 0xFF41, 0xFF5A)) return static_cast<VLUChar>(u - 0x20);
-  if (u == 0xFF) return 0x178;
   return u;
 }
 
