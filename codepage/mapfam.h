@@ -86,7 +86,12 @@ struct CpPage {
     const VLUChar u = toUni(v);
     return u == cp::kReplacement ? v : cp::uniToUtf8W(fn(u));  // a stray byte stays as it is
   }
-  VLUChar toUni(uint32_t v) const { return v <= 0xFF ? cp::sbcsUni(c, static_cast<uint8_t>(v)) : cp::wToUni(c, v); }
+  VLUChar toUni(uint32_t v) const {
+    if (v <= 0xFF) return cp::sbcsUni(c, static_cast<uint8_t>(v));
+    const VLUChar u = cp::wToUni(c, v);
+    // A UTF-8 sequence other than the shortest form of its unit stands for nothing.
+    return utf8 && cp::uniToUtf8W(u) != v ? cp::kReplacement : u;
+  }
   // Only a unit the page holds: a substitution byte would change text silently.
   bool fromUni(VLUChar u, uint32_t *v) const {
     *v = cp::uniToW(c, u);

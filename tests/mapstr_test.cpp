@@ -169,6 +169,8 @@ TEST_F(MapString, SpecialCasingInCodePages) {
       {"Turkish page: dotless i", "German_Germany.ISO-8859-9", kLower, "I\xDD", "\xFDi"},
       {"UTF-8 sharp s", "German_Germany.UTF-8", kUpper, "\xC3\x9F", "SS"},
       {"UTF-8 dotless i", "German_Germany.UTF-8", kLower, "I", "\xC4\xB1"},
+      {"UTF-8 overlong and broken sequences stay as they are", "German_Germany.UTF-8", kUpper,
+       "\xC1\xA9\xC3\x28\xE0\x81\xA9\x80", "\xC1\xA9\xC3\x28\xE0\x81\xA9\x80"},
   };
   for (const Row &r : rows) {
     VLLocale sp = withSpecial(r.locale);

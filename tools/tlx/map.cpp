@@ -225,7 +225,10 @@ int cmdMap(int argc, char **argv) {
   if (!l && name) l = VLConvertNativeLocale(name, 0, &rc);
   int status = 1;
   if (!l) {
-    std::fprintf(stderr, "tlx map: no locale '%s' (rc %u)\n", name ? name : "(the user's)", rc);
+    if (name)
+      std::fprintf(stderr, "tlx map: no locale '%s' (rc %u)\n", name, rc);
+    else
+      std::fprintf(stderr, "tlx map: the user's locale cannot be built (rc %u); name one with --locale\n", rc);
   } else {
     status = 0;
     if (files.empty()) files.push_back(nullptr);
