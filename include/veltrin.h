@@ -227,11 +227,13 @@ VL_API void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, u
 /* Further families. */
 #include "veltrin/vlchar.h"
 #include "veltrin/vlstring.h"
+#include "veltrin/vlcmp.h"
 #include "veltrin/vlconv.h"
 #include "veltrin/vlinfo.h"
 #include "veltrin/vlnative.h"
 #include "veltrin/vlstream.h"
 #include "veltrin/vlcatalog.h"
 #include "veltrin/vltime.h"
+#include "veltrin/vlmap.h"
 
 #endif /* VELTRIN_H */

@@ -308,13 +308,10 @@ bool flush(Encoder &e) {
 
 // Converts one input: 0 done, 1 stopped (the message is out).
 int convertFile(Job &job, const char *path) {
-  bool isStdin = !path || !std::strcmp(path, "-");
-  FILE *f = isStdin ? stdin : std::fopen(path, "rb");
-  const char *shown = isStdin ? "standard input" : path;
-  if (!f) {
-    std::fprintf(stderr, "tlx convert: cannot open input file '%s': %s\n", shown, std::strerror(errno));
-    return 1;
-  }
+  Input in("convert", path);
+  if (!in.f) return 1;
+  FILE *f = in.f;
+  const char *shown = in.shown;
   Decoder dec(job.from);
   Encoder enc(job.to);
   std::vector<uint8_t> pend;  // bytes read and not yet converted
@@ -379,7 +376,6 @@ int convertFile(Job &job, const char *path) {
     enc.finish();
     if (!flush(enc)) status = 1;
   }
-  if (!isStdin) std::fclose(f);
   return status;
 }
 

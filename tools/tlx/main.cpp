@@ -20,6 +20,7 @@ const Command kCommands[] = {
     {"catalog", cmdCatalog, "catalog FILE.cat            list a catalog as message source"},
     {"date", cmdDate, "date [--locale NAME] [--format P|--short|--long|--time] [--parse TEXT]  write or read a time"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
+    {"map", cmdMap, "map --lower|--upper|--full-width|--half-width|--digits [--simple] [--locale NAME] [FILE...]"},
 };
 
 void usage(FILE *out) {

@@ -1,5 +1,6 @@
 // Commands of the tlx tool; each lives in a file of its own.
 #pragma once
+#include <cstdio>
 #include <string>
 
 #include "veltrin.h"
@@ -11,9 +12,21 @@ int cmdTranslate(int argc, char **argv);
 int cmdGencat(int argc, char **argv);
 int cmdCatalog(int argc, char **argv);
 int cmdDate(int argc, char **argv);
+int cmdMap(int argc, char **argv);
 
 // The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
 const char *defsDir(const char *given);
 
 // UTF-16 for the terminal: UTF-8 when it takes UTF-8, else ASCII with \u escapes.
 std::string forTerminal(const VLUChar *u, bool utf8);
+
+// An input file, or standard input for null or "-"; closed when it goes. A file that
+// cannot be opened is reported under the command's name and leaves f null.
+struct Input {
+  FILE *f = nullptr;
+  const char *shown;
+  Input(const char *command, const char *path);
+  ~Input();
+  Input(const Input &) = delete;
+  Input &operator=(const Input &) = delete;
+};
