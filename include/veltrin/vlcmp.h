@@ -24,6 +24,22 @@ VL_API int32_t VLStrByteLength(VLWChar value);
 VL_API int32_t VLWcslen(VLLocale *locale, const VLWChar *str, uint32_t unused);
 VL_API int32_t VLStrlenU(VLLocale *locale, const VLUChar *str, uint32_t unused);
 
+/* Comparison: negative, 0 or positive (only the sign is defined). Rejected options give 0
+   with lastError 2; a failed allocation for a language with special casing gives 0 with
+   lastError 20. A length of -1 (Ex, W, U: any negative) means up to the 0. */
+VL_API int32_t VLStrcmp(VLLocale *locale, const char *str1, int32_t len1, const char *str2, int32_t len2,
+                        uint32_t options);
+VL_API int32_t VLStrcmpEx(VLLocale *locale, const char *str1, VLShiftState state1, int32_t len1, const char *str2,
+                          VLShiftState state2, int32_t len2, uint32_t options);
+VL_API int32_t VLWcscmp(VLLocale *locale, const VLWChar *str1, int32_t len1, const VLWChar *str2, int32_t len2,
+                        uint32_t options);
+VL_API int32_t VLStrcmpU(VLLocale *locale, const VLUChar *str1, int32_t len1, const VLUChar *str2, int32_t len2,
+                         uint32_t options);
+/* len cut back to a character boundary, walking from state over shift bytes. */
+VL_API int32_t AdjustLength(VLLocale *locale, const char *str, VLShiftState state, int32_t len);
+/* Swaps the two bytes of each 16-bit unit of buffer in place. */
+VL_API void VLStrBigEndian(void *buffer, int32_t byteCount);
+
 #ifdef __cplusplus
 }
 #endif

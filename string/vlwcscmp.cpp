@@ -1,0 +1,23 @@
+// Compares two W strings: exactly or without regard to case.
+#include "string/compare.h"
+
+VL_TRACE_MODULE("vlwcscmp");
+
+int32_t VLWcscmp(VLLocale *locale, const VLWChar *str1, int32_t len1, const VLWChar *str2, int32_t len2,
+                 uint32_t options) {
+  VL_FLOW("VLWcscmp");
+  using namespace vl::str;
+  // Lengths are always in values; width folding is refused in this form.
+  const uint32_t mode = options & ~(kCmpBlanks | VL_OPT_CHARLEN);
+  VLLocale *l = cmpLocale(locale, mode != 0 && mode != VL_CMP_NOCASE);
+  if (!l) VL_RET(int32_t{0});
+  const VLCodePage *c = l->codePage;
+  const uint8_t *table = foldTable(l);
+  auto fold = [c, table](uint32_t v) { return v > 0xFF ? VLCpMbCaseConvW(c, v, kFoldMask) : table[v]; };
+  auto map = [l](VLWChar *out, int32_t cap, const VLWChar *in, uint32_t n, int) {
+    return VLMapStringW(l, out, cap, in, static_cast<int32_t>(n), kMapUpperSel);
+  };
+  const VLWChar blank = vl::cp::isAscii(c) ? 0x20 : 0x40;
+  VL_RET(compareUnits<VLWChar>(l, str1, len1, str2, len2, (options & kCmpBlanks) != 0, blank, mode == 0,
+                               specialCasing(l), false, fold, map));
+}
