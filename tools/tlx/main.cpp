@@ -17,6 +17,8 @@ const Command kCommands[] = {
     {"convert", cmdConvert, "convert -f FROM -t TO [FILE...]  convert text between code pages"},
     {"info", cmdInfo, "info LOCALE [--items N,...] [--defaults]  show the information items of a locale"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
+    {"format", cmdFormat, "format number|currency [--locale NAME] [--intl] VALUE...  write numbers as a locale does"},
+    {"parse", cmdParse, "parse number [--locale NAME] [--money] TEXT...  read numbers written by a locale"},
 };
 
 void usage(FILE *out) {

@@ -1,10 +1,27 @@
 // Commands of the tlx tool; each lives in a file of its own.
 #pragma once
+#include <string>
 
 int cmdLocale(int argc, char **argv);
 int cmdConvert(int argc, char **argv);
 int cmdInfo(int argc, char **argv);
 int cmdTranslate(int argc, char **argv);
+int cmdFormat(int argc, char **argv);
+int cmdParse(int argc, char **argv);
 
 // The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
 const char *defsDir(const char *given);
+
+// Appends one UTF-16 unit as UTF-8 (a lone surrogate as its three bytes).
+inline void appendUtf8(std::string &s, unsigned c) {
+  if (c < 0x80) {
+    s += static_cast<char>(c);
+  } else if (c < 0x800) {
+    s += static_cast<char>(0xC0 | (c >> 6));
+    s += static_cast<char>(0x80 | (c & 0x3F));
+  } else {
+    s += static_cast<char>(0xE0 | (c >> 12));
+    s += static_cast<char>(0x80 | ((c >> 6) & 0x3F));
+    s += static_cast<char>(0x80 | (c & 0x3F));
+  }
+}
