@@ -91,7 +91,7 @@ inline int32_t unicodeDigit(uint32_t u) {
 
 // The next size of a grouping text in units of T; see VLStrGroupingSize.
 template <class T>
-int32_t groupingSize(bool ascii, const T *g, int32_t *remaining, const T **next) {
+int32_t groupingSize(bool ascii, const T *g, int32_t *remaining, T **next) {
   if (!remaining || !next) return -1;
   const uint32_t zero = ascii ? 0x30 : 0xF0, semi = ascii ? 0x3B : 0x5E;
   int32_t left = *remaining;
@@ -115,7 +115,7 @@ int32_t groupingSize(bool ascii, const T *g, int32_t *remaining, const T **next)
     *next = nullptr;
     *remaining = 0;
   } else {
-    *next = g + i;
+    *next = const_cast<T *>(g + i);
     *remaining = left;
   }
   return size;
@@ -144,7 +144,7 @@ class Groups {
 
  private:
   static constexpr int32_t kNever = INT32_MAX;
-  int32_t read() { return next_ ? groupingSize<uint32_t>(ascii_, next_, &rest_, &next_) : -1; }
+  int32_t read() { return next_ ? groupingSize<const uint32_t>(ascii_, next_, &rest_, &next_) : -1; }
   bool ascii_;
   int32_t rest_;
   const uint32_t *next_;
@@ -630,7 +630,7 @@ Text textOf(const VLLocale *l, const Unit<F> *s) {
 }
 
 template <Form F>
-int32_t getDigit(VLLocale *locale, const Unit<F> **position, VLShiftState *state, int32_t *length,
+int32_t getDigit(VLLocale *locale, Unit<F> **position, VLShiftState *state, int32_t length,
                  const Unit<F> *plus, const Unit<F> *minus, const Unit<F> *group, const Unit<F> *decimal,
                  int32_t asciiBased, uint32_t options) {
   VLLocale *l = step::use(locale);
@@ -643,18 +643,17 @@ int32_t getDigit(VLLocale *locale, const Unit<F> **position, VLShiftState *state
     return -1;
   }
   setRc(l, VL_RC_OK);
-  if (!position || !*position || !length || *length <= 0) return -1;
+  if (!position || !*position || length <= 0) return -1;
   Marks m;
   m.plus = textOf<F>(l, plus);
   m.minus = textOf<F>(l, minus);
   m.group = textOf<F>(l, group).first();
   m.decimal = textOf<F>(l, decimal).first();
-  const Reader<F> rd(l, *position, static_cast<uint32_t>(*length), digitTable(asciiBased),
+  const Reader<F> rd(l, *position, static_cast<uint32_t>(length), digitTable(asciiBased),
                      !kBytes<F> || (options & VL_NUM_DIGITS));
   Pos p{0, state && F == Form::Ex ? (*state ? 1u : 0u) : 0u};
   const int32_t t = rd.token(p, m);
   *position += p.at;
-  *length -= static_cast<int32_t>(p.at);
   if (state) *state = p.state;
   return t;
 }

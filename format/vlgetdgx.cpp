@@ -3,7 +3,7 @@
 
 VL_TRACE_MODULE("vlgetdgx");
 
-int32_t VLStrGetDigitEx(VLLocale *locale, const char **position, VLShiftState *state, int32_t *length, const char *plus,
+int32_t VLStrGetDigitEx(VLLocale *locale, char **position, VLShiftState *state, int32_t length, const char *plus,
                         const char *minus, const char *group, const char *decimal, int32_t asciiBased,
                         uint32_t options) {
   VL_FLOW("VLStrGetDigitEx");

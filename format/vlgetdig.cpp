@@ -3,7 +3,7 @@
 
 VL_TRACE_MODULE("vlgetdig");
 
-int32_t VLStrGetDigit(VLLocale *locale, const char **position, int32_t *length, const char *plus, const char *minus,
+int32_t VLStrGetDigit(VLLocale *locale, char **position, int32_t length, const char *plus, const char *minus,
                       const char *group, const char *decimal, int32_t asciiBased, uint32_t options) {
   VL_FLOW("VLStrGetDigit");
   VL_RET(vl::num::getDigit<vl::num::Form::Plain>(locale, position, nullptr, length, plus, minus, group, decimal,

@@ -3,7 +3,7 @@
 
 VL_TRACE_MODULE("vlgrpsz");
 
-int32_t VLStrGroupingSize(VLLocale *locale, const char *grouping, int32_t *remaining, const char **next) {
+int32_t VLStrGroupingSize(VLLocale *locale, const char *grouping, int32_t *remaining, char **next) {
   VL_FLOW("VLStrGroupingSize");
   VLLocale *l = vl::step::use(locale);
   if (!l) VL_RET(int32_t{-1});

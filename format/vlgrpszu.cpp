@@ -3,7 +3,7 @@
 
 VL_TRACE_MODULE("vlgrpszu");
 
-int32_t VLStrGroupingSizeU(VLLocale *locale, const VLUChar *grouping, int32_t *remaining, const VLUChar **next) {
+int32_t VLStrGroupingSizeU(VLLocale *locale, const VLUChar *grouping, int32_t *remaining, VLUChar **next) {
   VL_FLOW("VLStrGroupingSizeU");
   VLLocale *l = vl::step::use(locale);
   if (!l) VL_RET(int32_t{-1});

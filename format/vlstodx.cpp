@@ -4,7 +4,7 @@
 VL_TRACE_MODULE("vlstodx");
 
 double VLStringToDoubleEx(VLLocale *locale, const char *string, VLShiftState state, int32_t length, char **end,
-                          VLShiftState *endState, uint32_t options) {
+                          uint32_t options, VLShiftState *endState) {
   VL_FLOW("VLStringToDoubleEx");
   VL_RET(vl::num::stringToDouble<vl::num::Form::Ex>(locale, string, state, length, end, endState, options));
 }

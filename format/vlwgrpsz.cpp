@@ -3,7 +3,7 @@
 
 VL_TRACE_MODULE("vlwgrpsz");
 
-int32_t VLStrGroupingSizeW(VLLocale *locale, const VLWChar *grouping, int32_t *remaining, const VLWChar **next) {
+int32_t VLStrGroupingSizeW(VLLocale *locale, const VLWChar *grouping, int32_t *remaining, VLWChar **next) {
   VL_FLOW("VLStrGroupingSizeW");
   VLLocale *l = vl::step::use(locale);
   if (!l) VL_RET(int32_t{-1});

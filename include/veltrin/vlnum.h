@@ -51,24 +51,25 @@ VL_API int32_t VLStringToLongW(VLLocale *locale, const VLWChar *string, int32_t 
 /* The next size of a grouping text ("3;2;0"); -1 when absent, empty or malformed.
    *next moves past the size and its separator, *remaining (units; negative: up to the
    terminator) goes down; both become 0 at the end of the text. */
-VL_API int32_t VLStrGroupingSize(VLLocale *locale, const char *grouping, int32_t *remaining, const char **next);
+VL_API int32_t VLStrGroupingSize(VLLocale *locale, const char *grouping, int32_t *remaining, char **next);
 VL_API int32_t VLStrGroupingSizeU(VLLocale *locale, const VLUChar *grouping, int32_t *remaining,
-                                  const VLUChar **next);
+                                  VLUChar **next);
 VL_API int32_t VLStrGroupingSizeW(VLLocale *locale, const VLWChar *grouping, int32_t *remaining,
-                                  const VLWChar **next);
+                                  VLWChar **next);
 
-/* Reads one token at *position (at most *length units) and moves past it. The signs and
-   separators are 0-terminated texts of the same form (null or empty: none). */
-VL_API int32_t VLStrGetDigit(VLLocale *locale, const char **position, int32_t *length, const char *plus,
+/* Reads one token at *position (at most length units) and moves *position, and *state,
+   past it. The signs and separators are 0-terminated texts of the same form (null or
+   empty: none). */
+VL_API int32_t VLStrGetDigit(VLLocale *locale, char **position, int32_t length, const char *plus,
                              const char *minus, const char *group, const char *decimal, int32_t asciiBased,
                              uint32_t options);
-VL_API int32_t VLStrGetDigitEx(VLLocale *locale, const char **position, VLShiftState *state, int32_t *length,
+VL_API int32_t VLStrGetDigitEx(VLLocale *locale, char **position, VLShiftState *state, int32_t length,
                                const char *plus, const char *minus, const char *group, const char *decimal,
                                int32_t asciiBased, uint32_t options);
-VL_API int32_t VLStrGetDigitU(VLLocale *locale, const VLUChar **position, int32_t *length, const VLUChar *plus,
+VL_API int32_t VLStrGetDigitU(VLLocale *locale, VLUChar **position, int32_t length, const VLUChar *plus,
                               const VLUChar *minus, const VLUChar *group, const VLUChar *decimal,
                               int32_t asciiBased, uint32_t options);
-VL_API int32_t VLStrGetDigitW(VLLocale *locale, const VLWChar **position, int32_t *length, const VLWChar *plus,
+VL_API int32_t VLStrGetDigitW(VLLocale *locale, VLWChar **position, int32_t length, const VLWChar *plus,
                               const VLWChar *minus, const VLWChar *group, const VLWChar *decimal,
                               int32_t asciiBased, uint32_t options);
 
@@ -83,7 +84,7 @@ VL_API int32_t VLDoubleToStringW(VLLocale *locale, double value, VLWChar *buffer
 VL_API double VLStringToDouble(VLLocale *locale, const char *string, int32_t length, char **end,
                                uint32_t options);
 VL_API double VLStringToDoubleEx(VLLocale *locale, const char *string, VLShiftState state, int32_t length,
-                                 char **end, VLShiftState *endState, uint32_t options);
+                                 char **end, uint32_t options, VLShiftState *endState);
 VL_API double VLStringToDoubleU(VLLocale *locale, const VLUChar *string, int32_t length, VLUChar **end,
                                 uint32_t options);
 VL_API double VLStringToDoubleW(VLLocale *locale, const VLWChar *string, int32_t length, VLWChar **end,
