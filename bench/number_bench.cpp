@@ -11,7 +11,9 @@
 #include <cstdio>
 #include <cstdlib>
 #include <filesystem>
+#include <cstring>
 #include <map>
+#include <memory>
 #include <random>
 #include <string>
 #include <vector>
@@ -103,7 +105,8 @@ Fixture &fx() {
 }
 
 
-template <class Body>
+using Body = void (*)(Fixture &);
+
 void measure(benchmark::State &st, const char *row, const char *peer, Body body) {
   Fixture &f = fx();
   if (!f.ok) {
@@ -118,101 +121,91 @@ void measure(benchmark::State &st, const char *row, const char *peer, Body body)
   g_rate[row][peer] = s > 0 ? static_cast<double>(st.iterations() * kValues) / s / 1e6 : 0;
 }
 
-void intFormatOurs(benchmark::State &st) {
-  measure(st, "int format", "veltrin", [](Fixture &f) {
-    VLUChar u[64];
-    for (int32_t v : f.ints) benchmark::DoNotOptimize(VLLongToStringU(f.l, v, u, 64, 0));
-  });
-}
-void intFormatLibc(benchmark::State &st) {
-  LibcLocale c(fx().dir);
-  measure(st, "int format", "libc", [](Fixture &f) {
-    char b[64];
-    for (int32_t v : f.ints) benchmark::DoNotOptimize(std::snprintf(b, sizeof b, "%'d", v));
-  });
-}
-void intFormatIcu(benchmark::State &st) {
-  measure(st, "int format", "icu", [](Fixture &f) {
-    UChar u[64];
-    UErrorCode err = U_ZERO_ERROR;
-    for (int32_t v : f.ints) benchmark::DoNotOptimize(unum_format(f.icu, v, u, 64, nullptr, &err));
-  });
-}
-void intParseOurs(benchmark::State &st) {
-  measure(st, "int parse", "veltrin", [](Fixture &f) {
-    for (const auto &s : f.oursInt)
-      benchmark::DoNotOptimize(VLStringToLongU(f.l, reinterpret_cast<const VLUChar *>(s.data()),
-                                               static_cast<int32_t>(s.size()), nullptr, 10, 0));
-  });
-}
-void intParseLibc(benchmark::State &st) {
-  LibcLocale c(fx().dir);
-  measure(st, "int parse", "libc", [](Fixture &f) {
-    for (const auto &s : f.libcInt) benchmark::DoNotOptimize(std::strtol(s.c_str(), nullptr, 10));
-  });
-}
-void intParseIcu(benchmark::State &st) {
-  measure(st, "int parse", "icu", [](Fixture &f) {
-    UErrorCode err = U_ZERO_ERROR;
-    for (const auto &s : f.icuInt)
-      benchmark::DoNotOptimize(unum_parse(f.icu, reinterpret_cast<const UChar *>(s.data()),
-                                          static_cast<int32_t>(s.size()), nullptr, &err));
-  });
-}
-void dblFormatOurs(benchmark::State &st) {
-  measure(st, "double format", "veltrin", [](Fixture &f) {
-    VLUChar u[64];
-    for (double v : f.doubles) benchmark::DoNotOptimize(VLDoubleToStringU(f.l, v, u, 64, 0));
-  });
-}
-void dblFormatLibc(benchmark::State &st) {
-  LibcLocale c(fx().dir);
-  measure(st, "double format", "libc", [](Fixture &f) {
-    char b[64];
-    for (double v : f.doubles) benchmark::DoNotOptimize(std::snprintf(b, sizeof b, "%'.2f", v));
-  });
-}
-void dblFormatIcu(benchmark::State &st) {
-  measure(st, "double format", "icu", [](Fixture &f) {
-    UChar u[64];
-    UErrorCode err = U_ZERO_ERROR;
-    for (double v : f.doubles) benchmark::DoNotOptimize(unum_formatDouble(f.icu, v, u, 64, nullptr, &err));
-  });
-}
-void dblParseOurs(benchmark::State &st) {
-  measure(st, "double parse", "veltrin", [](Fixture &f) {
-    for (const auto &s : f.oursDouble)
-      benchmark::DoNotOptimize(VLStringToDoubleU(f.l, reinterpret_cast<const VLUChar *>(s.data()),
-                                                 static_cast<int32_t>(s.size()), nullptr, 0));
-  });
-}
-void dblParseLibc(benchmark::State &st) {
-  LibcLocale c(fx().dir);
-  measure(st, "double parse", "libc", [](Fixture &f) {
-    for (const auto &s : f.libcDouble) benchmark::DoNotOptimize(std::strtod(s.c_str(), nullptr));
-  });
-}
-void dblParseIcu(benchmark::State &st) {
-  measure(st, "double parse", "icu", [](Fixture &f) {
-    UErrorCode err = U_ZERO_ERROR;
-    for (const auto &s : f.icuDouble)
-      benchmark::DoNotOptimize(unum_parseDouble(f.icu, reinterpret_cast<const UChar *>(s.data()),
-                                                static_cast<int32_t>(s.size()), nullptr, &err));
-  });
+// Each row's three peers; the C library's run in its locale.
+struct Row {
+  const char *row, *peer;
+  Body body;
+};
+const Row kRows[] = {
+    {"int format", "veltrin",
+     [](Fixture &f) {
+       VLUChar u[64];
+       for (int32_t v : f.ints) benchmark::DoNotOptimize(VLLongToStringU(f.l, v, u, 64, 0));
+     }},
+    {"int format", "libc",
+     [](Fixture &f) {
+       char b[64];
+       for (int32_t v : f.ints) benchmark::DoNotOptimize(std::snprintf(b, sizeof b, "%'d", v));
+     }},
+    {"int format", "icu",
+     [](Fixture &f) {
+       UChar u[64];
+       UErrorCode err = U_ZERO_ERROR;
+       for (int32_t v : f.ints) benchmark::DoNotOptimize(unum_format(f.icu, v, u, 64, nullptr, &err));
+     }},
+    {"int parse", "veltrin",
+     [](Fixture &f) {
+       for (const auto &s : f.oursInt)
+         benchmark::DoNotOptimize(VLStringToLongU(f.l, reinterpret_cast<const VLUChar *>(s.data()),
+                                                  static_cast<int32_t>(s.size()), nullptr, 10, 0));
+     }},
+    {"int parse", "libc",
+     [](Fixture &f) {
+       for (const auto &s : f.libcInt) benchmark::DoNotOptimize(std::strtol(s.c_str(), nullptr, 10));
+     }},
+    {"int parse", "icu",
+     [](Fixture &f) {
+       UErrorCode err = U_ZERO_ERROR;
+       for (const auto &s : f.icuInt)
+         benchmark::DoNotOptimize(unum_parse(f.icu, reinterpret_cast<const UChar *>(s.data()),
+                                             static_cast<int32_t>(s.size()), nullptr, &err));
+     }},
+    {"double format", "veltrin",
+     [](Fixture &f) {
+       VLUChar u[64];
+       for (double v : f.doubles) benchmark::DoNotOptimize(VLDoubleToStringU(f.l, v, u, 64, 0));
+     }},
+    {"double format", "libc",
+     [](Fixture &f) {
+       char b[64];
+       for (double v : f.doubles) benchmark::DoNotOptimize(std::snprintf(b, sizeof b, "%'.2f", v));
+     }},
+    {"double format", "icu",
+     [](Fixture &f) {
+       UChar u[64];
+       UErrorCode err = U_ZERO_ERROR;
+       for (double v : f.doubles) benchmark::DoNotOptimize(unum_formatDouble(f.icu, v, u, 64, nullptr, &err));
+     }},
+    {"double parse", "veltrin",
+     [](Fixture &f) {
+       for (const auto &s : f.oursDouble)
+         benchmark::DoNotOptimize(VLStringToDoubleU(f.l, reinterpret_cast<const VLUChar *>(s.data()),
+                                                    static_cast<int32_t>(s.size()), nullptr, 0));
+     }},
+    {"double parse", "libc",
+     [](Fixture &f) {
+       for (const auto &s : f.libcDouble) benchmark::DoNotOptimize(std::strtod(s.c_str(), nullptr));
+     }},
+    {"double parse", "icu",
+     [](Fixture &f) {
+       UErrorCode err = U_ZERO_ERROR;
+       for (const auto &s : f.icuDouble)
+         benchmark::DoNotOptimize(unum_parseDouble(f.icu, reinterpret_cast<const UChar *>(s.data()),
+                                                   static_cast<int32_t>(s.size()), nullptr, &err));
+     }},
+};
+
+void run(benchmark::State &st, const Row *r) {
+  std::unique_ptr<LibcLocale> c;
+  if (!std::strcmp(r->peer, "libc")) c = std::make_unique<LibcLocale>(fx().dir);
+  measure(st, r->row, r->peer, r->body);
 }
 
-BENCHMARK(intFormatOurs)->Name("Number/int format/veltrin");
-BENCHMARK(intFormatLibc)->Name("Number/int format/libc");
-BENCHMARK(intFormatIcu)->Name("Number/int format/icu");
-BENCHMARK(intParseOurs)->Name("Number/int parse/veltrin");
-BENCHMARK(intParseLibc)->Name("Number/int parse/libc");
-BENCHMARK(intParseIcu)->Name("Number/int parse/icu");
-BENCHMARK(dblFormatOurs)->Name("Number/double format/veltrin");
-BENCHMARK(dblFormatLibc)->Name("Number/double format/libc");
-BENCHMARK(dblFormatIcu)->Name("Number/double format/icu");
-BENCHMARK(dblParseOurs)->Name("Number/double parse/veltrin");
-BENCHMARK(dblParseLibc)->Name("Number/double parse/libc");
-BENCHMARK(dblParseIcu)->Name("Number/double parse/icu");
+const int g_registered = [] {
+  for (const Row &r : kRows)
+    benchmark::RegisterBenchmark((std::string("Number/") + r.row + "/" + r.peer).c_str(), run, &r);
+  return 0;
+}();
 
 // The table, once the run is over.
 struct Table {

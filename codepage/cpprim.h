@@ -174,6 +174,10 @@ VL_HOT const VLCtypeRecord *ctypeOf(const VLCodePage *c, const uint8_t *p, unsig
   unsigned nodes = off(c, kTypeTrieOff), records = off(c, kTypeRecOff);
   if (!nodes || !records) return &kUnassigned;
   const uint8_t *b = body(c);
+  if (n == 1) {
+    if (!(flags(c) & kFlagOneByteTypes)) return &kUnassigned;
+    return reinterpret_cast<const VLCtypeRecord *>(b + records + kRecordSize * (1u + p[0]));
+  }
   const uint8_t *node = b + nodes;
   for (unsigned i = 0; i < n; ++i) {
     unsigned at = rd16(node + 2) + (p[i] & node[1]);

@@ -11,6 +11,7 @@
 #include <type_traits>
 
 #include "codepage/step.h"
+#include "codepage/unimap.h"
 #include "locale/info.h"
 
 namespace vl::num {
@@ -81,10 +82,10 @@ inline const int32_t *digitTable(int32_t asciiBased) {
                                                : VLEbcdicToNum;
 }
 
-// The ASCII digit value of a decimal digit of any script, or -1.
+// The value of a decimal digit of any script, or -1.
 inline int32_t unicodeDigit(uint32_t u) {
-  // Only the ASCII digits until the table of all scripts is in.
-  return u >= 0x30 && u <= 0x39 ? static_cast<int32_t>(u - 0x30) : -1;
+  const VLUChar a = u <= 0xFFFF ? umap::asciiDigit(static_cast<VLUChar>(u)) : 0;
+  return a ? static_cast<int32_t>(a - 0x30) : -1;
 }
 
 // ---- Grouping texts -------------------------------------------------------------------

@@ -227,9 +227,11 @@ VL_API void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, u
 /* Further families. */
 #include "veltrin/vlchar.h"
 #include "veltrin/vlstring.h"
+#include "veltrin/vlcmp.h"
 #include "veltrin/vlconv.h"
 #include "veltrin/vlinfo.h"
 #include "veltrin/vlnative.h"
 #include "veltrin/vlnum.h"
+#include "veltrin/vlmap.h"
 
 #endif /* VELTRIN_H */

@@ -161,6 +161,8 @@ uint32_t checkCodePage(VLObjEntry *e) {
     if (!start[2] || !start[3]) return kBad;
     uint32_t nodes = (end[2] - start[2]) / cp::kTypeNodeSize;
     uint32_t records = (end[3] - start[3]) / cp::kRecordSize;
+    // One-byte characters are read directly from records 1 to 256.
+    if ((vl::rd16(b + cp::kFlags) & cp::kFlagOneByteTypes) && records < 257) return kBad;
     for (uint32_t i = 0; i < nodes; ++i) swap16(b + start[2] + 4 * i + 2);
     for (uint32_t i = 0; i < records * 2; ++i) swap32(b + start[3] + 4 * i);
     const uint8_t *tn = b + start[2];

@@ -125,9 +125,10 @@ TEST_F(DefsGenerated, EveryCodePageMatchesIconv) {
       const bool single = bytes.size() == 1;
       if (single && vl::cp::sbcsType(cp, static_cast<uint8_t>(bytes[0])) != ucd().typeWord[u])
         types.bad("single byte " + hex(bytes));
-      if (!typeTrie || single) continue;  // one-byte characters have no type record
+      if (!typeTrie) continue;
       const std::string z = bytes + std::string(4, '\0');
-      const VLCtypeRecord *r = VLGetMbCtype(cp, reinterpret_cast<const unsigned char *>(z.data()));
+      const VLCtypeRecord *r = single ? VLGetMbCtypeW(cp, packW(bytes))
+                                      : VLGetMbCtype(cp, reinterpret_cast<const unsigned char *>(z.data()));
       if (r->type != ucd().typeWord[u]) types.bad(hex(bytes));
       // The case delta leads to the other case where it lives in this code page (in a
       // shift code page, in the same state), and nowhere otherwise.
@@ -145,6 +146,22 @@ TEST_F(DefsGenerated, EveryCodePageMatchesIconv) {
         libTrips += decode(encode(u)) == u;
       }
     }
+    // The single-byte case tables: the other case of each byte where that is one byte too.
+    Tally folds;
+    for (unsigned b = 0; b < 256; ++b) {
+      const uint16_t u = vl::cp::sbcsUni(cp, static_cast<uint8_t>(b));
+      for (const auto &[at, map] : {std::pair{vl::cp::kSbcsUpper, &UnicodeProps::upper},
+                                    std::pair{vl::cp::kSbcsLower, &UnicodeProps::lower}}) {
+        unsigned want = b;
+        if (u != 0xFFFD && vl::cp::charLen(cp, static_cast<uint8_t>(b)) == 1) {
+          const uint16_t other = (ucd().*map)[u];
+          const std::string o = encode(other);
+          if (o.size() == 1 && decode(o) == other) want = static_cast<uint8_t>(o[0]);
+        }
+        if (vl::cp::body(cp)[at + b] != want) folds.bad("byte " + std::to_string(b) + " at " + std::to_string(at));
+      }
+    }
+    EXPECT_EQ(folds.count, 0u) << folds.first;
     EXPECT_EQ(dec.count, 0u) << dec.first;
     EXPECT_EQ(enc.count, 0u) << enc.first;
     EXPECT_EQ(types.count, 0u) << types.first;
@@ -175,7 +192,9 @@ TEST_F(DefsGenerated, FamilyConventions) {
     EXPECT_EQ(vl::cp::subst(cp), r.subst) << r.id;
     EXPECT_EQ(vl::cp::body(cp)[vl::cp::kLf], r.lf) << r.id;
     EXPECT_EQ(vl::cp::maxLen(cp), r.maxLen) << r.id;
-    EXPECT_EQ(vl::cp::flags(cp), r.flags) << r.id;
+    EXPECT_EQ(vl::cp::flags(cp) & ~vl::cp::kFlagOneByteTypes, r.flags) << r.id;
+    // UTF-8 has no type trie (it is classified and mapped as Unicode).
+    EXPECT_EQ((vl::cp::flags(cp) & vl::cp::kFlagOneByteTypes) != 0, r.id != VL_CP_UTF8) << r.id;
     if (r.flags & 0x0002) {
       EXPECT_EQ(vl::cp::shiftOut(cp) * 256 + vl::cp::shiftIn(cp), 0x0E0F) << r.id;
     }

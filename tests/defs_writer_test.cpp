@@ -230,7 +230,7 @@ TEST(DefsCodePage, ShiftSensitive) {
   const Bytes &body = cp.sections[0];
   EXPECT_EQ(body[8], 0x0E);
   EXPECT_EQ(body[9], 0x0F);
-  EXPECT_EQ(be16(body, 4364), 0x0002);
+  EXPECT_EQ(be16(body, 4364), 0x0006);  // shift-sensitive, one-byte type records
   cpmem::Loaded l(cp.sections, s.id);
   ASSERT_EQ(l.rc, 0u);
   const VLUChar in[] = {'A', 0xFF21, 0xFF41, 'a', 0x1234};

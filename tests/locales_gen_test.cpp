@@ -62,7 +62,11 @@ class Generated : public ::testing::Test {
   static void SetUpTestSuite() {
     if (!fs::exists(kSrc)) return;
     objs_ = new std::vector<DefObject>;
-    ok_ = mkdefs::buildLanguagesAndTerritories(kSrc, cpId, objs_, &err_);
+    static mkdefs::UnicodeProps ucd;
+    static mkdefs::SpecialCasing sc;
+    ok_ = mkdefs::loadUnicode("", &ucd, &err_) && mkdefs::readSpecialCasing("/usr/share/unicode", &sc, &err_);
+    static const mkdefs::Casing casing{sc, ucd};
+    ok_ = ok_ && mkdefs::buildLanguagesAndTerritories(kSrc, cpId, objs_, &err_, &casing);
   }
   void SetUp() override {
     if (objs_ == nullptr) GTEST_SKIP() << "no locale sources in " << kSrc;
@@ -165,10 +169,8 @@ TEST_F(Generated, BodiesAreWellFormed) {
     const auto &b = o.sections[0];
     ASSERT_LE(b.size(), 65535u) << o.name;
     if (o.type == 0) {
-      EXPECT_EQ(word(o, 3), 0) << o.name;
-      EXPECT_EQ(word(o, 4), 0) << o.name;
-      EXPECT_LE(word(o, 49), b.size());
-      EXPECT_LE(word(o, 50), b.size());
+      EXPECT_LE(word(o, 49) + 8u * word(o, 3), b.size()) << o.name;
+      EXPECT_LE(word(o, 50) + 8u * word(o, 4), b.size()) << o.name;
       for (size_t w = 5; w <= 48; ++w) text(o, w);
       EXPECT_TRUE(text(o, 33).empty() && text(o, 46).empty()) << o.name;
       continue;
@@ -318,3 +320,89 @@ TEST(LocaleSource, PatternsUseTheFormattersDirectives) {
 }
 
 }  // namespace
+
+namespace {
+
+struct Entry {
+  std::u16string key, result;
+};
+std::vector<Entry> specialTable(const DefObject &o, int table) {
+  const auto &b = o.sections[0];
+  std::vector<Entry> t;
+  size_t at = word(o, table == 44 ? 49 : 50);
+  for (size_t i = 0; i < word(o, table == 44 ? 3 : 4); ++i, at += 8) {
+    auto u = [&](size_t k) { return static_cast<char16_t>(b.at(at + k) << 8 | b.at(at + k + 1)); };
+    Entry e;
+    for (size_t k : {0, 2})
+      if (u(k) || k == 0) e.key += u(k);
+    for (size_t k : {4, 6})
+      if (u(k) || k == 4) e.result += u(k);
+    t.push_back(e);
+  }
+  return t;
+}
+
+std::u16string bmp(const std::u32string &s) { return std::u16string(s.begin(), s.end()); }
+
+}  // namespace
+
+// Each language's tables against SpecialCasing.txt: every entry comes from a rule of the
+// language or of all languages, every unconditional rule that fits is there unless the
+// language has its own for that key, and the flag says whether anything is.
+TEST_F(Generated, SpecialCasingFollowsTheFile) {
+  mkdefs::SpecialCasing sc;
+  std::string err;
+  ASSERT_TRUE(mkdefs::readSpecialCasing("/usr/share/unicode", &sc, &err)) << err;
+  size_t languages = 0;
+  for (const auto &o : *objs_) {
+    if (o.type != 0) continue;
+    ++languages;
+    const std::string code = text8(o, 5);
+    for (int table : {44, 45}) {
+      const bool up = table == 44;
+      std::map<std::u16string, std::u16string> got;
+      for (const Entry &e : specialTable(o, table)) {
+        EXPECT_TRUE(got.emplace(e.key, e.result).second) << o.name << " key repeated";
+        bool traced = false;
+        for (const auto &r : sc.rules) {
+          if (!r.language.empty() && r.language != code) continue;
+          const std::u16string want = bmp(up ? r.upper : r.lower);
+          if (e.key == bmp({r.code}) && e.result == want) traced = true;
+          if (r.context == "After_Soft_Dotted" && e.key.size() == 2 && e.key[1] == r.code) traced = true;
+        }
+        EXPECT_TRUE(traced) << o.name << " table " << table << " key U+" << std::hex << int(e.key[0]);
+      }
+      for (const auto &r : sc.rules) {
+        const std::u32string &res = up ? r.upper : r.lower;
+        if (!r.language.empty() || !r.context.empty() || res.size() != 2) continue;
+        const bool own = std::any_of(sc.rules.begin(), sc.rules.end(),
+                                     [&](const auto &x) { return x.language == code && x.code == r.code; });
+        if (!own) {
+          EXPECT_EQ(got[bmp({r.code})], bmp(res)) << o.name << " U+" << std::hex << int(r.code);
+        }
+      }
+    }
+    EXPECT_EQ(word(o, 51), word(o, 3) || word(o, 4) ? 1 : 0) << o.name;
+  }
+  EXPECT_GT(languages, 20u);
+
+  const auto upper = [&](const char *lang) {
+    std::map<std::u16string, std::u16string> m;
+    for (const Entry &e : specialTable(get(0, lang), 44)) m[e.key] = e.result;
+    return m;
+  };
+  const auto lower = [&](const char *lang) {
+    std::map<std::u16string, std::u16string> m;
+    for (const Entry &e : specialTable(get(0, lang), 45)) m[e.key] = e.result;
+    return m;
+  };
+  EXPECT_EQ(upper("German")[u"\u00DF"], u"SS");
+  EXPECT_EQ(upper("German")[u"\u0149"], u"\u02BCN");
+  EXPECT_EQ(upper("German")[u"\uFB00"], u"FF");
+  EXPECT_EQ(upper("German").count(u"\uFB03"), 0u);  // three units
+  EXPECT_EQ(lower("German")[u"\u0130"], u"i\u0307");
+  EXPECT_EQ(upper("Turkish")[u"i"], u"\u0130");
+  EXPECT_EQ(lower("Turkish")[u"I"], u"\u0131");
+  EXPECT_EQ(lower("Turkish").count(u"\u0130"), 0u);  // left to the simple mapping
+  EXPECT_EQ(upper("English").count(u"i"), 0u);
+}

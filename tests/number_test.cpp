@@ -255,6 +255,38 @@ TEST_F(Num, TheTokenReaderClassifiesOneTokenAtATime) {
   EXPECT_EQ(VLGetError(l), static_cast<int32_t>(VL_RC_BADARG));
 }
 
+// Digits of other scripts: always in the U and W forms, with VL_NUM_DIGITS in the byte forms.
+TEST_F(Num, DigitsOfAnyScript) {
+  VLLocale *l = open("Japanese_Japan.MS932");
+  ASSERT_NE(l, nullptr);
+  struct Row {
+    std::u16string text;
+    int32_t value;
+  } rows[] = {
+      {u"\uFF11\uFF12\uFF13", 123},        // full-width
+      {u"\u0661\u0662", 12},                // Arabic-Indic
+      {u"-\u0967,\u0968\u0969\u096A", -1234},  // Devanagari with a group separator
+      {u"4\u0E52", 42},                      // Thai after an ASCII digit
+  };
+  for (const Row &r : rows) {
+    const auto *u = reinterpret_cast<const VLUChar *>(r.text.data());
+    const int32_t n = static_cast<int32_t>(r.text.size());
+    VLUChar *ue;
+    EXPECT_EQ(VLStringToLongU(l, u, n, &ue, 10, 0), r.value);
+    EXPECT_EQ(ue, u + n);
+    EXPECT_DOUBLE_EQ(VLStringToDoubleU(l, u, n, &ue, 0), r.value);
+  }
+  // Full-width digits in the code page: bytes 0x82 0x50 and on.
+  char fw[] = "\x82\x50\x82\x51";
+  char *end;
+  EXPECT_EQ(VLStringToLong(l, fw, 4, &end, 10, 0), 0) << "not without the option";
+  EXPECT_EQ(VLStringToLong(l, fw, 4, &end, 10, VL_NUM_DIGITS), 1 * 10 + 2);
+  EXPECT_EQ(end, fw + 4);
+  const VLWChar w[] = {0x8250, 0x8258, 0};
+  VLWChar *we;
+  EXPECT_EQ(VLStringToLongW(l, w, -1, &we, 10, 0), 19);
+}
+
 // ---- Floating point -------------------------------------------------------------------------
 
 TEST_F(Num, DoublesAreCutToThePrecisionNotRounded) {

@@ -1,4 +1,4 @@
-// mkctype [--ucd DIR] OUTPUT: writes the Unicode type tables of the library.
+// mkctype [--ucd DIR] CTYPE_OUTPUT [MAP_OUTPUT]: writes the Unicode tables of the library.
 #include <cstdio>
 #include <cstring>
 #include <string>
@@ -6,19 +6,21 @@
 #include "ctypegen.h"
 
 int main(int argc, char **argv) {
-  std::string ucd = "/usr/share/unicode", out;
+  std::string ucd = "/usr/share/unicode", out, mapOut;
   for (int i = 1; i < argc; ++i) {
     if (!std::strcmp(argv[i], "--ucd") && i + 1 < argc)
       ucd = argv[++i];
-    else
+    else if (out.empty())
       out = argv[i];
+    else
+      mapOut = argv[i];
   }
   if (out.empty()) {
-    std::fprintf(stderr, "usage: mkctype [--ucd DIR] OUTPUT\n");
+    std::fprintf(stderr, "usage: mkctype [--ucd DIR] CTYPE_OUTPUT [MAP_OUTPUT]\n");
     return 2;
   }
   std::string err;
-  if (!mkctype::writeCtypeSource(ucd, out, &err)) {
+  if (!mkctype::writeCtypeSource(ucd, out, &err, mapOut)) {
     std::fprintf(stderr, "mkctype: %s\n", err.c_str());
     return 1;
   }

@@ -15,14 +15,15 @@ namespace {
 
 constexpr size_t kHeader = 4376;
 constexpr size_t kV1Header = 4372;
-constexpr size_t kLenTable = 10, kSbcsUni = 778, kSbcsType = 1292, kIndex = 2316;
+constexpr size_t kLenTable = 10, kSbcsUpper = 266, kSbcsLower = 522, kSbcsUni = 778, kSbcsType = 1292;
+constexpr size_t kIndex = 2316;
 constexpr size_t kFlags = 4364, kFullOff = 4366, kPairOff = 4368, kTypeTrieOff = 4370;
 constexpr size_t kTypeRecOff = 4372, kValueOff = 4374;
 constexpr size_t kMaxSection = 0xFFFF;
 constexpr uint16_t kUtf8 = 57352;
 constexpr uint16_t kNoChar = 0xFFFD;
 constexpr uint32_t kUnassigned = 0x400;
-constexpr uint16_t kFlagAscii = 0x0001, kFlagShift = 0x0002;
+constexpr uint16_t kFlagAscii = 0x0001, kFlagShift = 0x0002, kFlagOneByteTypes = 0x0004;
 
 struct Failure : std::runtime_error {
   using std::runtime_error::runtime_error;
@@ -238,13 +239,17 @@ class TypeTrie {
     nodes_.push(kRootSlot);
   }
 
-  // seqs: every character of more than one byte, by its bytes. One-byte characters
-  // take their types from the fixed single-byte table.
-  void build(const std::map<std::string, Record> &seqs) {
+  // seqs: every character of more than one byte, by its bytes. oneByte: the records of
+  // the one-byte characters, by byte; they take records 1 to 256, which the library reads
+  // directly, and a single-byte page's root is a leaf over them.
+  void build(const std::map<std::string, Record> &seqs, const std::vector<Record> &oneByte) {
     recs_.push(0);  // the filler record sits at index 0
-    if (seqs.empty()) throw Failure("a type trie needs characters of more than one byte");
-    Node4 root = level(withKeys(seqs));
-    if (root.leaf) throw Failure("type trie root must consume the lead byte");
+    for (const Record &r : oneByte) recs_.push(recKey(r));
+    Node4 root{1, 0xFF, 1};
+    if (!seqs.empty()) {
+      root = level(withKeys(seqs));
+      if (root.leaf) throw Failure("type trie root must consume the lead byte");
+    }
     nodes_.replace(0, nodeKey(root));
   }
 
@@ -475,6 +480,37 @@ struct Page {
     }
     return Record{type, delta};
   }
+
+  // The byte of the other case of one-byte character b, when that is a one-byte
+  // character too; b itself otherwise.
+  uint8_t oneByteCase(uint8_t b, const std::vector<uint16_t> &map) const {
+    if (!single[b] || src.lenByLead[b] != 1) return b;
+    auto o = roundTrip(map[*single[b]]);
+    return o && o->size() == 1 ? static_cast<uint8_t>((*o)[0]) : b;
+  }
+
+  // Type records of the characters of more than one byte.
+  std::map<std::string, Record> typeSeqs() const {
+    std::map<std::string, Record> seqs;
+    if (utf8) {
+      for (uint32_t u = 0x80; u < 0x10000; ++u) {
+        if (u >= 0xD800 && u <= 0xDFFF) continue;
+        const std::string s = utf8Of(u);
+        seqs[s] = record(s, static_cast<uint16_t>(u));
+      }
+    } else {
+      for (const auto &[s, u] : multi) seqs[s] = record(s, u);
+    }
+    return seqs;
+  }
+
+  // Type records of the one-byte characters, by byte.
+  std::vector<Record> oneByteRecords() const {
+    std::vector<Record> out(256, kNoRecord);
+    for (int b = 0; b < 256; ++b)
+      if (single[b] && src.lenByLead[b] == 1) out[b] = record(std::string(1, static_cast<char>(b)), *single[b]);
+    return out;
+  }
 };
 
 void checkSource(const CpSource &s, bool utf8) {
@@ -536,8 +572,10 @@ void buildV2(const CpSource &src, const UnicodeProps &ucd, bool withTypeTrie, Cp
     const auto &u = page.single[b];
     set16(body, kSbcsUni + 2 * b, u ? *u : kNoChar);
     set32(body, kSbcsType + 4 * b, u ? ucd.typeWord[*u] : kUnassigned);
+    body[kSbcsUpper + b] = page.oneByteCase(static_cast<uint8_t>(b), ucd.upper);
+    body[kSbcsLower + b] = page.oneByteCase(static_cast<uint8_t>(b), ucd.lower);
   }
-  set16(body, kFlags, static_cast<uint16_t>((src.ascii ? kFlagAscii : 0) | (src.shift ? kFlagShift : 0)));
+  uint16_t flags = static_cast<uint16_t>((src.ascii ? kFlagAscii : 0) | (src.shift ? kFlagShift : 0));
 
   std::map<uint16_t, uint32_t> fromW;
   if (utf8) {
@@ -586,26 +624,17 @@ void buildV2(const CpSource &src, const UnicodeProps &ucd, bool withTypeTrie, Cp
         put32(body, f);
       }
     }
-
-    if (withTypeTrie) {
-      std::map<std::string, Record> seqs;
-      if (utf8) {
-        for (uint32_t u = 0x80; u < 0x10000; ++u) {
-          if (u >= 0xD800 && u <= 0xDFFF) continue;
-          const std::string s = utf8Of(u);
-          seqs[s] = page.record(s, static_cast<uint16_t>(u));
-        }
-      } else {
-        for (const auto &[s, u] : page.multi) seqs[s] = page.record(s, u);
-      }
-      TypeTrie types;
-      types.build(seqs);
-      set16(body, kTypeTrieOff, index16(body.size(), "section 0 (body): type trie offset"));
-      types.write(body);
-      set16(body, kTypeRecOff, index16(body.size(), "section 0 (body): type record offset"));
-      types.writeRecords(body);
-    }
   }
+  if (withTypeTrie) {
+    TypeTrie types;
+    types.build(page.typeSeqs(), page.oneByteRecords());
+    set16(body, kTypeTrieOff, index16(body.size(), "section 0 (body): type trie offset"));
+    types.write(body);
+    set16(body, kTypeRecOff, index16(body.size(), "section 0 (body): type record offset"));
+    types.writeRecords(body);
+    flags |= kFlagOneByteTypes;
+  }
+  set16(body, kFlags, flags);
 
   out->sections = {std::move(body), std::move(trie), std::move(low), std::move(high)};
 }

@@ -16,6 +16,7 @@
 
 #include "locsrc_parse.h"
 #include "locsrc_pattern.h"
+#include "specialcase.h"
 
 namespace mkdefs {
 namespace {
@@ -47,7 +48,7 @@ const std::map<std::string, Identity> kIdentity = {
     {"Yugoslavia", {"YU", U"Yugoslavia", 891}},
 };
 
-const size_t kLanguageWords = 51;   // 0-48 and the two special-case table offsets
+const size_t kLanguageWords = 52;   // 0-48, the two special-case table offsets, the special-casing flag
 const size_t kTerritoryWords = 22;
 
 std::string sourceFor(const std::string &native) {
@@ -97,6 +98,16 @@ class Body {
     }
     word(w, static_cast<uint16_t>(at < 0x10000 ? at : 0));
     tooBig_ = tooBig_ || at >= 0x10000;
+  }
+  // Appends a special-case table and points word w at it.
+  void table(size_t w, const std::vector<SpecialEntry> &t) {
+    word(w, static_cast<uint16_t>(bytes_.size() < 0x10000 ? bytes_.size() : 0));
+    tooBig_ = tooBig_ || bytes_.size() >= 0x10000;
+    for (const SpecialEntry &e : t)
+      for (uint16_t v : {e.key1, e.key2, e.res1, e.res2}) {
+        bytes_.push_back(static_cast<uint8_t>(v >> 8));
+        bytes_.push_back(static_cast<uint8_t>(v));
+      }
   }
   bool finish(const std::string &what, Bytes *out, std::string *err) {
     if (tooBig_ || bytes_.size() > 65535) {
@@ -317,7 +328,8 @@ std::string defaultCodePage(const std::vector<const NativeRow *> &rows, const Na
 }
 
 bool buildLanguage(locsrc::SourceSet &set, const std::string &name, const NativeRow &primary,
-                   uint16_t territoryId, uint16_t codePageId, DefObject *obj, std::string *err) {
+                   uint16_t territoryId, uint16_t codePageId, const Casing *casing, DefObject *obj,
+                   std::vector<std::string> *report, std::string *err) {
   std::string src = sourceFor(primary.native);
   Fetch f(set, src, err);
   obj->type = 0;
@@ -337,10 +349,19 @@ bool buildLanguage(locsrc::SourceSet &set, const std::string &name, const Native
   b.word(0, territoryId);
   b.word(1, codePageId);
   b.word(2, 0);
-  b.word(3, 0);  // special-case tables 44 and 45: no entries
-  b.word(4, 0);
-  b.word(49, static_cast<uint16_t>(kLanguageWords * 2));
-  b.word(50, static_cast<uint16_t>(kLanguageWords * 2));
+  SpecialTables sp;
+  if (casing) sp = specialTablesFor(casing->rules, locsrc::toUtf8(code), casing->ucd);
+  b.word(3, static_cast<uint16_t>(sp.upper.size()));
+  b.word(4, static_cast<uint16_t>(sp.lower.size()));
+  b.table(49, sp.upper);
+  b.table(50, sp.lower);
+  b.word(51, sp.upper.empty() && sp.lower.empty() ? 0 : 1);
+  if (report && casing) {
+    std::string line = name + ": special casing " + std::to_string(sp.upper.size()) + " upper, " +
+                       std::to_string(sp.lower.size()) + " lower";
+    for (const std::string &u : sp.unfit) line += "\n    not carried: " + u;
+    report->push_back(line);
+  }
   b.text(5, code);
   b.text(6, display);
   struct Names {
@@ -361,7 +382,8 @@ bool buildLanguage(locsrc::SourceSet &set, const std::string &name, const Native
 
 bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
                                   const std::function<uint16_t(const std::string &)> &codePageId,
-                                  std::vector<DefObject> *out, std::string *err) {
+                                  std::vector<DefObject> *out, std::string *err, const Casing *casing,
+                                  std::vector<std::string> *report) {
   locsrc::SourceSet set(localeSrcDir);
   std::vector<std::string> languages;
   std::map<std::string, std::vector<const NativeRow *>> rowsOf;
@@ -400,7 +422,7 @@ bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
     DefObject obj;
     obj.id = static_cast<uint16_t>(i + 1);
     if (!buildLanguage(set, languages[i], *primary, territoryIds[primary->territory],
-                       cpName.empty() ? 0 : codePageId(cpName), &obj, err))
+                       cpName.empty() ? 0 : codePageId(cpName), casing, &obj, report, err))
       return false;
     objs.push_back(std::move(obj));
   }

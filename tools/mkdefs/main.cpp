@@ -218,8 +218,14 @@ int main(int argc, char **argv) {
     }
     return 0;
   };
+  SpecialCasing special;
+  if (!readSpecialCasing(ucdDir, &special, &err)) return fail(err);
+  const Casing casing{special, ucd};
+  std::vector<std::string> casingReport;
   std::vector<DefObject> objects;
-  if (buildLanguagesAndTerritories(localeSrc, codePageId, &objects, &err)) {
+  if (buildLanguagesAndTerritories(localeSrc, codePageId, &objects, &err, &casing, &casingReport)) {
+    rep << "\nLanguage special casing (tables 44 upper, 45 lower) and what it cannot carry:\n";
+    for (const std::string &line : casingReport) rep << line << "\n";
     for (const DefObject &o : objects) {
       Bytes file;
       if (!containerFile(o.sections, 2, &file, &err) ||

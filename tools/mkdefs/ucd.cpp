@@ -158,6 +158,7 @@ bool loadUnicode(const std::string &dirIn, UnicodeProps *out, std::string *err) 
   p.lower.resize(kBmp);
   p.wide.assign(kBmp, 0);
   p.narrow.assign(kBmp, 0);
+  p.digit.assign(kBmp, 0xFF);
   for (uint32_t c = 0; c < kBmp; ++c) p.upper[c] = p.lower[c] = static_cast<uint16_t>(c);
 
   {
@@ -186,6 +187,8 @@ bool loadUnicode(const std::string &dirIn, UnicodeProps *out, std::string *err) 
       }
       const std::string &dec = f[5];
       if (!f[7].empty() && (dec.rfind("<super>", 0) == 0 || dec.rfind("<sub>", 0) == 0)) r.superDigit[c] = 1;
+      if ((f[2] == "Nd" && !f[6].empty()) || r.superDigit[c])
+        p.digit[c] = static_cast<uint8_t>(std::stoul(f[r.superDigit[c] ? 7 : 6]));
       if (!f[12].empty()) p.upper[c] = static_cast<uint16_t>(std::stoul(f[12], nullptr, 16));
       if (!f[13].empty()) p.lower[c] = static_cast<uint16_t>(std::stoul(f[13], nullptr, 16));
       // Width counterparts: "<wide> X" marks c as the full-width form of X, "<narrow> X"

@@ -14,6 +14,7 @@ struct UnicodeProps {
   std::vector<uint16_t> lower;   // simple lower-case mapping, or the code point itself
   std::vector<uint16_t> wide;    // full-width counterpart, or 0
   std::vector<uint16_t> narrow;  // half-width counterpart, or 0
+  std::vector<uint8_t> digit;    // value 0-9 of a character with the digit type bit, or 0xFF
 };
 
 // Reads UnicodeData.txt and the companion files from dir (default /usr/share/unicode).

@@ -227,17 +227,13 @@ class Converter {
 
 // Converts one input; the status iconv would give.
 int convertFile(Side &from, Side &to, const char *path) {
-  bool isStdin = !path || !std::strcmp(path, "-");
-  FILE *f = isStdin ? stdin : std::fopen(path, "rb");
-  const char *shown = isStdin ? "standard input" : path;
-  if (!f) {
-    std::fprintf(stderr, "tlx convert: cannot open input file '%s': %s\n", shown, std::strerror(errno));
-    return 1;
-  }
+  Input in("convert", path);
+  if (!in.f) return 1;
+  FILE *f = in.f;
+  const char *shown = in.shown;
   Converter c(from, to);
   if (!c.ok()) {
     std::fprintf(stderr, "tlx convert: no memory for the conversion\n");
-    if (!isStdin) std::fclose(f);
     return 1;
   }
   std::vector<uint8_t> buf(kChunk);
@@ -268,7 +264,6 @@ int convertFile(Side &from, Side &to, const char *path) {
                  shown, static_cast<unsigned long long>(offset - c.held()));
     status = 1;
   }
-  if (!isStdin) std::fclose(f);
   return status;
 }
 

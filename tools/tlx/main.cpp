@@ -19,6 +19,7 @@ const Command kCommands[] = {
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
     {"format", cmdFormat, "format number|currency [--locale NAME] [--intl] VALUE...  write numbers as a locale does"},
     {"parse", cmdParse, "parse number [--locale NAME] [--money] TEXT...  read numbers written by a locale"},
+    {"map", cmdMap, "map --lower|--upper|--full-width|--half-width|--digits [--simple] [--locale NAME] [FILE...]"},
 };
 
 void usage(FILE *out) {

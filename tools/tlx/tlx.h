@@ -8,6 +8,7 @@ int cmdInfo(int argc, char **argv);
 int cmdTranslate(int argc, char **argv);
 int cmdFormat(int argc, char **argv);
 int cmdParse(int argc, char **argv);
+int cmdMap(int argc, char **argv);
 
 // The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
 const char *defsDir(const char *given);
@@ -25,3 +26,15 @@ inline void appendUtf8(std::string &s, unsigned c) {
     s += static_cast<char>(0x80 | (c & 0x3F));
   }
 }
+#include <cstdio>
+
+// An input file, or standard input for null or "-"; closed when it goes. A file that
+// cannot be opened is reported under the command's name and leaves f null.
+struct Input {
+  FILE *f = nullptr;
+  const char *shown;
+  Input(const char *command, const char *path);
+  ~Input();
+  Input(const Input &) = delete;
+  Input &operator=(const Input &) = delete;
+};

@@ -1,0 +1,11 @@
+// Lower-case counterpart of a UTF-16 unit.
+#include "codepage/unimap.h"
+#include "frame/frame.h"
+
+VL_TRACE_MODULE("vlunilow");
+
+VLUChar VLUnicodeToLower(VLLocale *locale, VLUChar unit) {
+  VL_FLOW("VLUnicodeToLower");
+  vl::setRc(vl::orDefault(locale), VL_RC_OK);
+  VL_RET(vl::umap::toLower(unit));
+}
