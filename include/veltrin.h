@@ -234,6 +234,7 @@ VL_API void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, u
 #include "veltrin/vlstream.h"
 #include "veltrin/vlcatalog.h"
 #include "veltrin/vltime.h"
+#include "veltrin/vlnum.h"
 #include "veltrin/vlmap.h"
 
 #endif /* VELTRIN_H */

@@ -93,13 +93,8 @@ std::string forTerminal(const VLUChar *u, bool utf8) {
       char e[8];
       std::snprintf(e, sizeof e, "\\u%04X", c);
       s += e;
-    } else if (c < 0x800) {
-      s += static_cast<char>(0xC0 | (c >> 6));
-      s += static_cast<char>(0x80 | (c & 0x3F));
     } else {
-      s += static_cast<char>(0xE0 | (c >> 12));
-      s += static_cast<char>(0x80 | ((c >> 6) & 0x3F));
-      s += static_cast<char>(0x80 | (c & 0x3F));
+      appendUtf8(s, c);
     }
   }
   return s;

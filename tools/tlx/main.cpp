@@ -20,6 +20,8 @@ const Command kCommands[] = {
     {"catalog", cmdCatalog, "catalog FILE.cat            list a catalog as message source"},
     {"date", cmdDate, "date [--locale NAME] [--format P|--short|--long|--time] [--parse TEXT]  write or read a time"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
+    {"format", cmdFormat, "format number|currency [--locale NAME] [--intl] VALUE...  write numbers as a locale does"},
+    {"parse", cmdParse, "parse number [--locale NAME] [--money] TEXT...  read numbers written by a locale"},
     {"map", cmdMap, "map --lower|--upper|--full-width|--half-width|--digits [--simple] [--locale NAME] [FILE...]"},
 };
 

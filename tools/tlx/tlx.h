@@ -12,6 +12,8 @@ int cmdTranslate(int argc, char **argv);
 int cmdGencat(int argc, char **argv);
 int cmdCatalog(int argc, char **argv);
 int cmdDate(int argc, char **argv);
+int cmdFormat(int argc, char **argv);
+int cmdParse(int argc, char **argv);
 int cmdMap(int argc, char **argv);
 
 // The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
@@ -19,6 +21,19 @@ const char *defsDir(const char *given);
 
 // UTF-16 for the terminal: UTF-8 when it takes UTF-8, else ASCII with \u escapes.
 std::string forTerminal(const VLUChar *u, bool utf8);
+// Appends one UTF-16 unit as UTF-8 (a lone surrogate as its three bytes).
+inline void appendUtf8(std::string &s, unsigned c) {
+  if (c < 0x80) {
+    s += static_cast<char>(c);
+  } else if (c < 0x800) {
+    s += static_cast<char>(0xC0 | (c >> 6));
+    s += static_cast<char>(0x80 | (c & 0x3F));
+  } else {
+    s += static_cast<char>(0xE0 | (c >> 12));
+    s += static_cast<char>(0x80 | ((c >> 6) & 0x3F));
+    s += static_cast<char>(0x80 | (c & 0x3F));
+  }
+}
 
 // An input file, or standard input for null or "-"; closed when it goes. A file that
 // cannot be opened is reported under the command's name and leaves f null.
