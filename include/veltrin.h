@@ -230,5 +230,6 @@ VL_API void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, u
 #include "veltrin/vlconv.h"
 #include "veltrin/vlinfo.h"
 #include "veltrin/vlnative.h"
+#include "veltrin/vlcoll.h"
 
 #endif /* VELTRIN_H */

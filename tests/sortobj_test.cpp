@@ -29,11 +29,11 @@ TEST(SortObject, HealthyBodyLoadsInNativeOrder) {
   ASSERT_EQ(s.rc, 0u);
   so::Weights w;
   EXPECT_EQ(so::weightsOf(s.sort(), 'b', &w), 1);
-  EXPECT_EQ(w.e[0].primary, 0x102);
+  EXPECT_EQ(w.e[0].primary, 0x122);
   EXPECT_EQ(so::weightsOf(s.sort(), 0xE6, &w), 2);
-  EXPECT_EQ(w.e[1].primary, 0x108);
+  EXPECT_EQ(w.e[1].primary, 0x128);
   EXPECT_EQ(so::combinationOf(s.sort(), 'c', 'h', &w), 1);
-  EXPECT_EQ(w.e[0].primary, 0x10F);
+  EXPECT_EQ(w.e[0].primary, 0x12F);
 }
 
 TEST(SortObject, DamagedBodiesAreRefused) {

@@ -8,7 +8,7 @@
 
 namespace sortmem {
 
-// Block 0x00 through the weight table (letters a-z primaries 0x100 + 2i, capitals the same
+// Block 0x00 through the weight table (digits primaries 0x100 + d, letters a-z 0x120 + 2i, capitals the same
 // primary with tertiary 2, '-' fourth-level only, U+00E6 expanding to a+e, U+00E5 weights
 // with a backward secondary), block 0x03 ignorable, block 0x4E arithmetic primaries,
 // block 0x20 arithmetic fourth level; "ch" combines after 'h'.

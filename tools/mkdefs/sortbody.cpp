@@ -49,7 +49,7 @@ bool SortBody::bytes(Bytes *out, std::string *err) const {
     put16(b, c.flags);
   }
   if (b.size() > 0xFFFF) {
-    *err = "sort body of " + std::to_string(b.size()) + " bytes exceeds a section";
+    *err = "sort body of " + std::to_string(b.size()) + " bytes (" + std::to_string(weights.size()) + " weights, " + std::to_string(expansions.size()) + " expansions) exceeds a section";
     return false;
   }
   *out = std::move(b);
