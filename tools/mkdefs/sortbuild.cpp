@@ -155,7 +155,6 @@ bool buildOne(const coll::Table &t, SortBody *body, Counts *c, std::string *err)
     return count;
   };
 
-  // The most common secondary and tertiary are left out of keys at their ends.
   std::map<uint8_t, size_t> sFreq, tFreq;
   struct Unit {
     bool listed = false;
@@ -185,12 +184,14 @@ bool buildOne(const coll::Table &t, SortBody *body, Counts *c, std::string *err)
       if (e[el].t) ++tFreq[e[el].t];
     }
   }
+  // Leaving trailing defaults out keeps the order only when the default is the lowest
+  // weight of its level; a tailoring that puts capitals first gets no default.
   auto mostCommon = [](const std::map<uint8_t, size_t> &f) {
     uint8_t best = 0;
     size_t bn = 0;
     for (auto [v, k] : f)
       if (k > bn) best = v, bn = k;
-    return best;
+    return best == 1 ? best : uint8_t{0};
   };
   body->defSec = mostCommon(sFreq);
   body->defTer = mostCommon(tFreq);
