@@ -260,6 +260,15 @@ uint32_t checkSort(VLObjEntry *e) {
     swap16Run(c, 3);
     swap16(c + 8);
   }
+  // Lookups halve these tables, so each must be in strictly ascending order.
+  for (uint32_t i = 1; i < exps; ++i)
+    if (vl::rd16(b + start[1] + so::kExpSize * (i - 1)) >= vl::rd16(b + start[1] + so::kExpSize * i)) return kBad;
+  auto pair = [&](uint32_t i) {
+    const uint8_t *c = b + start[2] + so::kCombSize * i;
+    return static_cast<uint32_t>(vl::rd16(c)) << 16 | vl::rd16(c + 2);
+  };
+  for (uint32_t i = 1; i < combs; ++i)
+    if (pair(i - 1) >= pair(i)) return kBad;
   return 0;
 }
 

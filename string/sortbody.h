@@ -39,6 +39,20 @@ inline void fromEntry(uint16_t word, uint8_t sec, uint8_t ter, uint16_t flags, W
   w->cls = static_cast<uint8_t>((flags & kClassMask) >> 10);
 }
 
+// The entry of a table in ascending order (proven at load) whose key is k: the unit, or
+// the two units of a combination as one 32-bit value.
+inline const uint8_t *find(const uint8_t *t, uint32_t n, uint32_t size, uint32_t k) {
+  uint32_t lo = 0, hi = n;
+  while (lo < hi) {
+    const uint32_t mid = (lo + hi) / 2;
+    const uint8_t *e = t + size * mid;
+    const uint32_t v = size == kCombSize ? static_cast<uint32_t>(rd16(e)) << 16 | rd16(e + 2) : rd16(e);
+    if (v == k) return e;
+    if (v < k) lo = mid + 1; else hi = mid;
+  }
+  return nullptr;
+}
+
 // 0 = no weights, 1 = one element, 2 = two elements.
 inline int weightsOf(const VLObjEntry *s, uint16_t unit, Weights *w) {
   const uint8_t *b = body(s);
@@ -60,9 +74,8 @@ inline int weightsOf(const VLObjEntry *s, uint16_t unit, Weights *w) {
   const uint8_t *e = b + rd16(b + kWeightOff) + kWeightSize * at;
   const uint16_t ef = rd16(e + 4);
   if (ef & kExpands) {
-    const uint8_t *x = b + rd16(b + kExpOff);
-    for (uint32_t i = 0, n = rd16(b + kExpCount); i < n; ++i, x += kExpSize) {
-      if (rd16(x) != unit) continue;
+    const uint8_t *x = find(b + rd16(b + kExpOff), rd16(b + kExpCount), kExpSize, unit);
+    if (x) {
       w->e[0] = Element{rd16(x + 2), x[4], x[5], 0};
       w->e[1] = Element{rd16(x + 6), x[8], x[9], 0};
       w->cls = static_cast<uint8_t>((ef & kClassMask) >> 10);
@@ -77,9 +90,9 @@ inline int weightsOf(const VLObjEntry *s, uint16_t unit, Weights *w) {
 // 1 when the pair forms one element.
 inline int combinationOf(const VLObjEntry *s, uint16_t u1, uint16_t u2, Weights *w) {
   const uint8_t *b = body(s);
-  const uint8_t *c = b + rd16(b + kCombOff);
-  for (uint32_t i = 0, n = rd16(b + kCombCount); i < n; ++i, c += kCombSize) {
-    if (rd16(c) != u1 || rd16(c + 2) != u2) continue;
+  const uint8_t *c = find(b + rd16(b + kCombOff), rd16(b + kCombCount), kCombSize,
+                         static_cast<uint32_t>(u1) << 16 | u2);
+  if (c) {
     *w = Weights{};
     fromEntry(rd16(c + 4), c[6], c[7], rd16(c + 8), w);
     return 1;

@@ -58,8 +58,11 @@ TEST(SortObject, DamagedBodiesAreRefused) {
        [&](Bytes &b) { b[blocks + 4 * 0x4E] = 0x02, at16(b, blocks + 4 * 0x4E + 2, 0xFF01); }},
       {"an arithmetic fourth-level block that wraps",
        [&](Bytes &b) { b[blocks + 4 * 0x20] = 0x04, at16(b, blocks + 4 * 0x20 + 2, 0xFFFF); }},
-      {"no weight table for blocks that need one", [](Bytes &b) {
-         at16(b, so::kWeightOff, 0);
+      {"no weight table for blocks that need one", [](Bytes &b) { at16(b, so::kWeightOff, 0); }},
+      {"combinations out of order", [](Bytes &b) {
+         const size_t c = get16(b, so::kCombOff);
+         at16(b, so::kCombCount, 2);
+         b.insert(b.begin() + static_cast<long>(c + 10), {0, 'a', 0, 'a', 1, 0, 1, 1, 0, 0});
        }},
   };
   for (const auto &c : cases) {

@@ -195,8 +195,12 @@ bool buildOne(const coll::Table &t, SortBody *body, Counts *c, std::string *err)
   };
   body->defSec = mostCommon(sFreq);
   body->defTer = mostCommon(tFreq);
-  std::sort(body->combinations.begin(), body->combinations.end(),
-            [](const auto &a, const auto &b) { return std::tie(a.u1, a.u2) < std::tie(b.u1, b.u2); });
+  // Ascending and unique, as lookups halve the table; a pair named twice keeps its first.
+  std::stable_sort(body->combinations.begin(), body->combinations.end(),
+                   [](const auto &a, const auto &b) { return std::tie(a.u1, a.u2) < std::tie(b.u1, b.u2); });
+  body->combinations.erase(std::unique(body->combinations.begin(), body->combinations.end(),
+                                       [](const auto &a, const auto &b) { return a.u1 == b.u1 && a.u2 == b.u2; }),
+                           body->combinations.end());
 
   // Blocks: ignorable when nothing in them weighs, arithmetic when every listed unit is a
   // lone primary that follows its code, else 256 entries of the weight table (identical
