@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 #include <locale.h>
 
+#include <algorithm>
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
@@ -11,6 +12,7 @@
 #include <string>
 #include <vector>
 
+#include "support/defdir.h"
 #include "support/hooks.h"
 #include "veltrin.h"
 
@@ -149,5 +151,44 @@ TEST_P(CollateOracle, AgreesWithTheCLibrary) {
 
 INSTANTIATE_TEST_SUITE_P(Sorts, CollateOracle, ::testing::ValuesIn(kLangs),
                          [](const auto &info) { return std::string(info.param.sort); });
+
+}  // namespace
+
+namespace {
+
+// tlx sort: the order of a Swedish list, the options, and the status of bad input.
+TEST(TlxSort, SortsLinesByCollation) {
+  if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
+  ts::TempDir d;
+  {
+    FILE *f = std::fopen(d.file("in.txt").c_str(), "w");
+    std::fputs("\xc3\x96l\nzebra\nApple\n\xc3\xa5sna\napple\n\xc3\x84pple\nazur\n", f);  // Öl åsna Äpple
+    std::fclose(f);
+  }
+  struct Case {
+    const char *args, *out;
+    int status;
+  } cases[] = {
+      {"--locale Swedish_Sweden.UTF-8", "apple Apple azur zebra \xc3\xa5sna \xc3\x84pple \xc3\x96l ", 0},
+      {"--locale Swedish_Sweden.UTF-8 --reverse", "\xc3\x96l \xc3\x84pple \xc3\xa5sna zebra azur Apple apple ", 0},
+      {"--locale Swedish_Sweden.UTF-8 --ignore-case --unique", "Apple azur zebra \xc3\xa5sna \xc3\x84pple \xc3\x96l ", 0},
+      {"--locale English_UnitedStates.UTF-8", "apple Apple \xc3\x84pple \xc3\xa5sna azur \xc3\x96l zebra ", 0},
+      {"--locale Nowhere", "", 2},
+      {"--bogus", "", 2},
+  };
+  for (const Case &c : cases) {
+    const std::string cmd = std::string(VL_TEST_TLX) + " sort --dir " + VL_TEST_DEFS_DIR + " " + c.args + " " +
+                            d.file("in.txt") + " 2>/dev/null";
+    FILE *p = popen(cmd.c_str(), "r");
+    ASSERT_NE(p, nullptr);
+    char buf[512];
+    std::string out;
+    while (std::fgets(buf, sizeof buf, p)) out += buf;
+    std::replace(out.begin(), out.end(), '\n', ' ');
+    const int st = pclose(p);
+    EXPECT_EQ(out, c.out) << c.args;
+    EXPECT_EQ(WEXITSTATUS(st), c.status) << c.args;
+  }
+}
 
 }  // namespace

@@ -17,6 +17,7 @@ const Command kCommands[] = {
     {"convert", cmdConvert, "convert -f FROM -t TO [FILE...]  convert text between code pages"},
     {"info", cmdInfo, "info LOCALE [--items N,...] [--defaults]  show the information items of a locale"},
     {"translate", cmdTranslate, "translate --from N --to N [options]  translate a string between code pages"},
+    {"sort", cmdSort, "sort [--locale NAME] [options] [FILE...]  sort lines by a locale's collation"},
 };
 
 void usage(FILE *out) {
