@@ -149,7 +149,7 @@ struct Source {
       if constexpr (sizeof(U<F>) == 2)
         *u = *p;
       else
-        *u = cp::wToUni(cp, *p);
+        *u = *p < 0x100 ? cp::sbcsUni(cp, static_cast<uint8_t>(*p)) : cp::wToUni(cp, *p);
       *len = 1;
     } else {
       const uint32_t n = f.len(p);

@@ -89,6 +89,43 @@ TEST_F(Collate, OrderOfTheSampleRules) {
   }
 }
 
+// The plain, Ex (a page without shifts passes through), W and UTF-16 forms order the same
+// Latin-1 words alike, and their keys are the same bytes.
+TEST_F(Collate, FormsAgree) {
+  const std::vector<std::string> words = {"ab", "Ab", "ach", "ah", "ai", "a-b", "\xe6", "ae", "\xe5\xe4", "\xe4\xe5", "9", ""};
+  auto wide = [](const std::string &s) {
+    std::vector<VLWChar> w;
+    for (unsigned char c : s) w.push_back(c);
+    w.push_back(0);
+    return w;
+  };
+  auto utf16 = [](const std::string &s) {
+    std::vector<VLUChar> u;
+    for (unsigned char c : s) u.push_back(c);
+    u.push_back(0);
+    return u;
+  };
+  for (const std::string &a : words) {
+    for (const std::string &b : words) {
+      const auto la = static_cast<int32_t>(a.size()), lb = static_cast<int32_t>(b.size());
+      const int plain = sign(VLStrcoll(l_, a.data(), la, b.data(), lb, 0));
+      EXPECT_EQ(sign(VLStrcollEx(l_, a.data(), 0, la, b.data(), 0, lb, 0)), plain) << a << " " << b;
+      EXPECT_EQ(sign(VLWcscoll(l_, wide(a).data(), la, wide(b).data(), lb, 0)), plain) << a << " " << b;
+      EXPECT_EQ(sign(VLStrcollU(l_, utf16(a).data(), la, utf16(b).data(), lb, 0)), plain) << a << " " << b;
+    }
+    char k1[128], k2[128], k3[128], k4[128];
+    const auto la = static_cast<int32_t>(a.size());
+    const int32_t n = VLStrxfrm(l_, k1, sizeof k1, a.data(), la, 0);
+    ASSERT_EQ(VLStrxfrmEx(l_, k2, sizeof k2, a.data(), 0, la, 0), n);
+    ASSERT_EQ(VLWcsxfrm(l_, k3, sizeof k3, wide(a).data(), la, 0), n);
+    ASSERT_EQ(VLStrxfrmU(l_, k4, sizeof k4, utf16(a).data(), la, 0), n);
+    EXPECT_EQ(std::memcmp(k1, k2, static_cast<size_t>(n)) | std::memcmp(k1, k3, static_cast<size_t>(n)) |
+                  std::memcmp(k1, k4, static_cast<size_t>(n)),
+              0)
+        << a;
+  }
+}
+
 TEST_F(Collate, KeysInPlaceAllocatedShortAndEmpty) {
   const U16 s = u"Ch\u00e6-ab\u00e5\u4e00";
   const auto *u = reinterpret_cast<const VLUChar *>(s.data());
