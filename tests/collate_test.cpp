@@ -197,3 +197,39 @@ TEST_F(Collate, CaseBlindOptionsAndTrailingBlanks) {
 }
 
 }  // namespace
+
+namespace {
+
+TEST_F(Collate, SubstringSearchInFourForms) {
+  struct Case {
+    const char *why, *str, *sub;
+    uint32_t options;
+    int at;  // -1: no match
+  } cases[] = {
+      {"exact match after a near miss", "abcabd", "abd", 0, 3},
+      {"the empty substring matches at the start", "abc", "", 0, 0},
+      {"a longer substring never matches", "ab", "abc", 0, -1},
+      {"no match", "abcabc", "abd", 0, -1},
+      {"case counts without options", "xxABd", "abd", 0, -1},
+      {"case-blind match", "xxABd", "abd", VL_COLL_IGNORECASE, 2},
+      {"case- and width-blind match", "xAbD", "abd", VL_COLL_IGNOREWIDTH, 1},
+      {"case-blind still needs the letters", "xxABe", "abd", VL_COLL_IGNORECASE, -1},
+  };
+  for (const Case &c : cases) {
+    const auto n = static_cast<int32_t>(std::strlen(c.str)), m = static_cast<int32_t>(std::strlen(c.sub));
+    const char *p = VLStrstr(l_, c.str, n, c.sub, m, c.options);
+    EXPECT_EQ(p ? static_cast<int>(p - c.str) : -1, c.at) << c.why;
+    const char *x = VLStrstrEx(l_, c.str, 0, -1, c.sub, 0, -1, c.options);
+    EXPECT_EQ(x ? static_cast<int>(x - c.str) : -1, c.at) << c.why << " (Ex)";
+    std::vector<VLUChar> us(c.str, c.str + n + 1), ub(c.sub, c.sub + m + 1);
+    const VLUChar *u = VLStrstrU(l_, us.data(), n, ub.data(), m, c.options);
+    EXPECT_EQ(u ? static_cast<int>(u - us.data()) : -1, c.at) << c.why << " (U)";
+    std::vector<VLWChar> ws(c.str, c.str + n + 1), wb(c.sub, c.sub + m + 1);
+    const VLWChar *w = VLWcsstr(l_, ws.data(), -1, wb.data(), -1, c.options);
+    EXPECT_EQ(w ? static_cast<int>(w - ws.data()) : -1, c.at) << c.why << " (W)";
+  }
+  EXPECT_EQ(VLStrstr(l_, "abc", 3, "b", 1, 0x10), nullptr);
+  EXPECT_EQ(VLGetError(l_), 2);
+}
+
+}  // namespace

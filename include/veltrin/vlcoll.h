@@ -73,6 +73,18 @@ VL_API int VLWcscoll(VLLocale *locale, const VLWChar *str1, int32_t len1, const 
 VL_API int VLStrcollU(VLLocale *locale, const VLUChar *str1, int32_t len1, const VLUChar *str2, int32_t len2,
                       uint32_t options);
 
+/* First occurrence of sub in str, or null: exact with options 0; with VL_COLL_IGNORECASE or
+   VL_COLL_IGNOREWIDTH (bit 0x01 also allowed) a candidate span of sub's length matches
+   when it collates equal to sub. A rejected option word stores 2 and gives null. */
+VL_API char *VLStrstr(VLLocale *locale, const char *str, int32_t len, const char *sub, int32_t subLen,
+                      uint32_t options);
+VL_API char *VLStrstrEx(VLLocale *locale, const char *str, VLShiftState strState, int32_t len, const char *sub,
+                        VLShiftState subState, int32_t subLen, uint32_t options);
+VL_API VLWChar *VLWcsstr(VLLocale *locale, const VLWChar *str, int32_t len, const VLWChar *sub, int32_t subLen,
+                         uint32_t options);
+VL_API VLUChar *VLStrstrU(VLLocale *locale, const VLUChar *str, int32_t len, const VLUChar *sub, int32_t subLen,
+                          uint32_t options);
+
 #ifdef __cplusplus
 }
 #endif
