@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -230,6 +231,42 @@ TEST_F(Collate, SubstringSearchInFourForms) {
   }
   EXPECT_EQ(VLStrstr(l_, "abc", 3, "b", 1, 0x10), nullptr);
   EXPECT_EQ(VLGetError(l_), 2);
+}
+
+}  // namespace
+
+namespace {
+
+// Each allocation a call makes fails in turn: code 20, the documented result, no leak.
+TEST_F(Collate, AllocationFailures) {
+  const std::string longer(200, 'a'), other = std::string(199, 'a') + "b";
+  const U16 units(100, u'a');
+  struct Case {
+    const char *why;
+    int failing;  // which allocation of the call fails
+    std::function<bool()> failed;
+    bool setsCode = true;
+  } cases[] = {
+      {"key units", 1, [&] { char k[8]; return VLStrxfrm(l_, k, sizeof k, longer.data(), 200, 0) == -1; }},
+      {"key work area", 2, [&] { char k[8]; return VLStrxfrm(l_, k, sizeof k, longer.data(), 200, 0) == -1; }},
+      {"comparison work area", 1,
+       [&] { return VLStrcoll(l_, longer.data(), 200, other.data(), 200, 0) == 0; }},
+      {"generated key work area", 1, [&] {
+         unsigned char k[8];
+         return VLStrGenSortKey(l_, k, sizeof k, reinterpret_cast<const VLUChar *>(units.data()), 100) == -1;
+       }, false},
+  };
+  for (const Case &c : cases) {
+    const long live = ts::hooks.live;
+    ts::hooks.failAt = ts::hooks.allocs + c.failing;
+    EXPECT_TRUE(c.failed()) << c.why;
+    ts::hooks.failAt = -1;
+    EXPECT_EQ(ts::hooks.live, live) << c.why << " leaked";
+    if (c.setsCode) {
+      EXPECT_EQ(VLGetError(l_), 20) << c.why;
+    }
+  }
+  EXPECT_LT(VLStrcoll(l_, longer.data(), 200, other.data(), 200, 0), 0);
 }
 
 }  // namespace
