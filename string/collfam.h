@@ -4,6 +4,7 @@
 #pragma once
 #include <cstdint>
 #include <cstring>
+#include <iterator>
 
 #include "codepage/step.h"
 #include "string/sortbody.h"
@@ -335,16 +336,20 @@ int32_t xfrm(VLLocale *l, F f, uint8_t *dst, int32_t dstLen, const U<F> *src, in
     if (room) std::memset(dst, 0, room < 3 ? room : 3);
     return 3;
   }
-  Block<uint16_t> units(size_t{n} * 4);
-  if (!units) {
+  // Short strings keep their units on the stack.
+  uint16_t small[128];
+  const bool onStack = n <= std::size(small);
+  Block<uint16_t> own(onStack ? nullptr : static_cast<uint16_t *>(alloc(size_t{n} * 4)));
+  if (!onStack && !own) {
     setRc(l, VL_RC_NOMEM);
     return -1;
   }
+  uint16_t *units = onStack ? small : own.get();
   Source<F> s{f, l->codePage, l->sort, src, n};
   uint32_t count = 0, len;
   uint16_t u;
-  while (s.read(&u, &len)) units.get()[count++] = u;
-  const int32_t k = genKey(l->sort, dst, room, units.get(), count, opts != 0);
+  while (s.read(&u, &len)) units[count++] = u;
+  const int32_t k = genKey(l->sort, dst, room, units, count, opts != 0);
   if (k < 0) setRc(l, VL_RC_NOMEM);
   return k;
 }
@@ -368,7 +373,8 @@ int coll(VLLocale *l, F fa, const U<F> *a, int32_t alen, F fb, const U<F> *b, in
   const bool noTertiary = (opts & kIgnoreCase) == kIgnoreCase;
   if (!usesSort(l)) return binaryCompare(a, an, b, bn);
   const uint32_t na = workSize(an ? an : 1), nb = workSize(bn ? bn : 1);
-  alignas(8) uint8_t stack[256];
+  // Typical words fit on the stack; only long strings take the allocation hook.
+  alignas(8) uint8_t stack[2048];
   const bool onStack = na + nb <= sizeof stack;
   Block<uint8_t> own(onStack ? nullptr : static_cast<uint8_t *>(alloc(na + nb)));
   if (!onStack && !own) {
