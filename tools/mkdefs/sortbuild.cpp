@@ -167,7 +167,12 @@ bool buildOne(const coll::Table &t, SortBody *body, Counts *c, std::string *err)
     Elem e[2];
     int k = elems(it, e);
     if (it.u2) {
-      if (k == 2) ++c->splitLevels;
+      // A pair that expands to two elements (the reordering vowel pairs of Thai and its
+      // neighbours) cannot be held; left out, its units weigh one by one.
+      if (k == 2) {
+        ++c->splitLevels;
+        continue;
+      }
       uint16_t flags = static_cast<uint16_t>(it.cls << 10 | (e[0].q ? 0x8000 : 0));
       body->combinations.push_back({static_cast<uint16_t>(it.u1), static_cast<uint16_t>(it.u2),
                                     e[0].q ? e[0].q : e[0].p, e[0].s, e[0].t, flags});
@@ -329,7 +334,7 @@ bool buildSorts(const std::string &localeSrcDir, std::vector<SortObject> *out, s
       << "not expressed: " << c.longContractions << " contractions of three or more units, " << c.longExpansions
       << " expansions to more than two elements, " << c.beyondBmp << " characters beyond the BMP, " << c.merged
       << " secondary or tertiary sequences merged, " << c.splitLevels
-      << " combinations expanding to two elements (first kept), " << c.unknown << " unknown weight symbols\n"
+      << " combinations expanding to two elements (left out), " << c.unknown << " unknown weight symbols\n"
       << "approximated: " << c.approximated << " unlisted units in arithmetic blocks, " << c.codeOrder
       << " units of blocks beyond the weight table sorted by code after all others\n\n";
     o.report = r.str();
