@@ -236,5 +236,6 @@ VL_API void *VLCpV1toV2(const void *body, uint32_t bodySize, const void *trie, u
 #include "veltrin/vltime.h"
 #include "veltrin/vlnum.h"
 #include "veltrin/vlmap.h"
+#include "veltrin/vlcoll.h"
 
 #endif /* VELTRIN_H */

@@ -5,6 +5,7 @@
 
 #include "codepage/cpprim.h"
 #include "store/store.h"
+#include "string/sortbody.h"
 
 namespace {
 
@@ -232,6 +233,63 @@ uint32_t checkCodePage(VLObjEntry *e) {
   return 0;
 }
 
+// Sort bodies: each table runs to the next one's start or the end of the body; every
+// block that indexes the weight table must find all 256 of its entries there.
+uint32_t checkSort(VLObjEntry *e) {
+  namespace so = vl::sort;
+  auto *b = static_cast<uint8_t *>(e->section[0]);
+  uint32_t size = e->sectionSize[0];
+  if (!b || size < so::kHeader) return kBad;
+  swap16(b + so::kExpCount);
+  swap16(b + so::kCombCount);
+  for (int i = 0; i < 256; ++i) swap16(b + so::kBlocks + 4 * i + 2);
+  swap16Run(b + so::kWeightOff, 3);
+  const uint32_t start[3] = {vl::rd16(b + so::kWeightOff), vl::rd16(b + so::kExpOff), vl::rd16(b + so::kCombOff)};
+  uint32_t end[3];
+  for (int i = 0; i < 3; ++i) {
+    if (start[i] && (start[i] < so::kHeader || start[i] > size)) return kBad;
+    end[i] = size;
+    for (int j = 0; j < 3; ++j)
+      if (start[j] > start[i] && start[j] < end[i]) end[i] = start[j];
+  }
+  const uint32_t weights = start[0] ? (end[0] - start[0]) / so::kWeightSize : 0;
+  const uint32_t exps = vl::rd16(b + so::kExpCount), combs = vl::rd16(b + so::kCombCount);
+  if (exps && (!start[1] || (end[1] - start[1]) / so::kExpSize < exps)) return kBad;
+  if (combs && (!start[2] || (end[2] - start[2]) / so::kCombSize < combs)) return kBad;
+  for (int i = 0; i < 256; ++i) {
+    const uint8_t *x = b + so::kBlocks + 4 * i;
+    const uint32_t top = vl::rd16(x + 2) + 255u;
+    if (x[0] & so::kBlockIgnore) continue;
+    if ((x[0] & (so::kBlockPrimary | so::kBlockFourth)) ? top > 0xFFFF : top >= weights) return kBad;
+  }
+  for (uint32_t i = 0; i < weights; ++i) {
+    uint8_t *w = b + start[0] + so::kWeightSize * i;
+    swap16(w);
+    swap16(w + 4);
+  }
+  for (uint32_t i = 0; i < exps; ++i) {
+    uint8_t *x = b + start[1] + so::kExpSize * i;
+    swap16(x);
+    swap16(x + 2);
+    swap16(x + 6);
+  }
+  for (uint32_t i = 0; i < combs; ++i) {
+    uint8_t *c = b + start[2] + so::kCombSize * i;
+    swap16Run(c, 3);
+    swap16(c + 8);
+  }
+  // Lookups halve these tables, so each must be in strictly ascending order.
+  for (uint32_t i = 1; i < exps; ++i)
+    if (vl::rd16(b + start[1] + so::kExpSize * (i - 1)) >= vl::rd16(b + start[1] + so::kExpSize * i)) return kBad;
+  auto pair = [&](uint32_t i) {
+    const uint8_t *c = b + start[2] + so::kCombSize * i;
+    return static_cast<uint32_t>(vl::rd16(c)) << 16 | vl::rd16(c + 2);
+  };
+  for (uint32_t i = 1; i < combs; ++i)
+    if (pair(i - 1) >= pair(i)) return kBad;
+  return 0;
+}
+
 }  // namespace
 
 uint32_t vl::store::checkObject(VLObjEntry *e) {
@@ -242,6 +300,8 @@ uint32_t vl::store::checkObject(VLObjEntry *e) {
       return checkTextBody(e, 22, 11, 21);
     case VL_OBJ_CODEPAGE:
       return checkCodePage(e);
+    case VL_OBJ_SORT:
+      return checkSort(e);
     default:
       return e->section[0] ? 0 : kBad;
   }

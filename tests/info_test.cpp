@@ -10,6 +10,7 @@
 
 #include "codepage/cpbody.h"
 #include "store/store.h"
+#include "support/sortmem.h"
 #include "support/defdir.h"
 #include "support/hooks.h"
 
@@ -82,7 +83,10 @@ class Info : public ::testing::Test {
   static void SetUpTestSuite() {
     dir_ = new ts::TempDir;
     ts::DefDir d = ts::DefDir::standard();
-    d.add(3, 5, "Phonebook", {ts::Bytes(16, 0)});
+    ts::Bytes sortBody;
+    std::string err;
+    sortmem::sampleBody().bytes(&sortBody, &err);
+    d.add(3, 5, "Phonebook", {sortBody});
     // A page where "." is a double-byte character: no handle can take it as punctuation.
     auto wideDot = ts::doubleByteSource(934, "WIDEDOT");
     wideDot.fromUni[u'.'] = "\x82\x40";

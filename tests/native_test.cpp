@@ -80,8 +80,8 @@ TEST_F(Native, HandlesFromNativeNames) {
       {"C", 0, 0, "English_UnitedStates.US-ASCII@Binary"},
       {"POSIX", 1, 0, "English_UnitedStates.US-ASCII@Binary"},
       {"de_DE.UTF-8", 0, VL_RC_NOLANGUAGE, nullptr},
-      {"de_DE.UTF-8", 4, 0, "English_UnitedStates.US-ASCII@Binary"},
-      {"de_DE@euro", 4, 0, "German_Germany.UTF-8@Binary"},  // sorts fall back to the language's
+      {"de_DE.UTF-8", 4, 0, "English_UnitedStates.US-ASCII@Default"},
+      {"de_DE@euro", 4, 0, "German_Germany.UTF-8@Default"},  // the language's own sort
       {"C", 2, VL_RC_BADARG, nullptr},
       {"C", 8, VL_RC_BADARG, nullptr},
   };
@@ -99,15 +99,15 @@ TEST_F(Native, HandlesFromNativeNames) {
 TEST_F(Native, SetLocaleReplacesTheDefaultOnlyOnSuccess) {
   EXPECT_EQ(VLSetLocale("German_Germany", 0), 0u);
   ASSERT_NE(vlglocale, nullptr);
-  EXPECT_EQ(nameOf(vlglocale), "German_Germany.Latin1@Binary");
+  EXPECT_EQ(nameOf(vlglocale), "German_Germany.Latin1@Default");
   EXPECT_EQ(VLSetLocale("Klingon", 0), VL_RC_NOLANGUAGE);
-  EXPECT_EQ(nameOf(vlglocale), "German_Germany.Latin1@Binary");
+  EXPECT_EQ(nameOf(vlglocale), "German_Germany.Latin1@Default");
   const VLWChar w[] = {'E', 'n', 'g', 'l', 'i', 's', 'h', 0};
   EXPECT_EQ(VLSetLocaleW(w, 0), 0u);
-  EXPECT_EQ(nameOf(vlglocale), "English_UnitedStates.US-ASCII@Binary");
+  EXPECT_EQ(nameOf(vlglocale), "English_UnitedStates.US-ASCII@Default");
   const VLUChar u[] = {'G', 'e', 'r', 'm', 'a', 'n', '.', 'M', 'S', '9', '3', '2', 0};
   EXPECT_EQ(VLSetLocaleU(u, 0), 0u);
-  EXPECT_EQ(nameOf(vlglocale), "German_Germany.MS932@Binary");
+  EXPECT_EQ(nameOf(vlglocale), "German_Germany.MS932@Default");
   EXPECT_EQ(VLSetLocale("x", 1), VL_RC_BADARG);
 }
 
@@ -293,7 +293,7 @@ TEST_F(NativeInfo, UserLocaleFromThePlatformTakesItsConventions) {
   VLLocale *l = VLGetLocale(nullptr, VL_LOCALE_USER | VL_LOCALE_FALLBACK, &rc);
   ASSERT_NE(l, nullptr);
   EXPECT_EQ(rc, 0u);
-  EXPECT_EQ(nameOf(l), "German_Germany.Latin1@Binary");
+  EXPECT_EQ(nameOf(l), "German_Germany.Latin1@Default");
   EXPECT_EQ(l->chars[2], static_cast<uint8_t>(decimal_[0]));
   EXPECT_EQ(VLGetError(l), 0);
   VLReleaseLocale(l);

@@ -276,7 +276,7 @@ void ThreadAndProcessLocales() {
   EXPECT_EQ(nameOf(vlglocale), "English_UnitedStates.US-ASCII");
   char text[64];
   EXPECT_GT(NLS1_GetLocaleTextInfo(nullptr, VL_ITEM_LOCALE, text, sizeof text, 0), 0);
-  EXPECT_STREQ(text, "German_Germany.Latin1@Binary");
+  EXPECT_STREQ(text, "German_Germany.Latin1@Default");
   // Another thread is not disturbed.
   std::thread([] { EXPECT_EQ(nameOf(NLS1_PrivateFunction_GetThreadLocale()), "English_UnitedStates.US-ASCII"); })
       .join();
@@ -354,10 +354,10 @@ void ManyThreads() {
     std::string name;
   };
   const std::vector<Target> targets = {
-      {NLS1_LOCALE_ID(german, 276), 0, "German_Germany.Latin1@Binary"},
-      {NLS1_LOCALE_ID(german, 840), 932, "German_UnitedStates.MS932@Binary"},
-      {NLS1_LOCALE_ID(1, 840), 0, "English_UnitedStates.US-ASCII@Binary"},
-      {NLS1_LOCALE_ID(1, 276), 57352, "English_Germany.UTF-8@Binary"},
+      {NLS1_LOCALE_ID(german, 276), 0, "German_Germany.Latin1@Default"},
+      {NLS1_LOCALE_ID(german, 840), 932, "German_UnitedStates.MS932@Default"},
+      {NLS1_LOCALE_ID(1, 840), 0, "English_UnitedStates.US-ASCII@Default"},
+      {NLS1_LOCALE_ID(1, 276), 57352, "English_Germany.UTF-8@Default"},
   };
   const std::string text = "\xE6\x97\xA5\xE6\x9C\xAC\xE8\xAA\x9E ABC \xEF\xBD\xB1";
   std::string sj, eb, u;

@@ -15,6 +15,7 @@
 #include "cpread.h"
 #include "iconvcp.h"
 #include "locales.h"
+#include "sortbuild.h"
 #include "ucd.h"
 
 namespace {
@@ -218,6 +219,19 @@ int main(int argc, char **argv) {
     }
     return 0;
   };
+  std::vector<SortObject> sorts;
+  if (!buildSorts(localeSrc, &sorts, &err)) return fail(err);
+  std::map<std::string, uint16_t> sortIds;
+  for (const SortObject &so : sorts) {
+    Bytes body, file;
+    if (!so.body.bytes(&body, &err) || !containerFile({body}, 2, &file, &err) ||
+        !writeFile(outDir + "/" + objectFileName(3, so.id), file, &err))
+      return fail(so.name + ": " + err);
+    rows.push_back(ControlRow{so.id, 3, so.name});
+    sortIds[so.name] = so.id;
+    rep << so.report;
+  }
+
   SpecialCasing special;
   if (!readSpecialCasing(ucdDir, &special, &err)) return fail(err);
   const Casing casing{special, ucd};
@@ -226,7 +240,11 @@ int main(int argc, char **argv) {
   if (buildLanguagesAndTerritories(localeSrc, codePageId, &objects, &err, &casing, &casingReport)) {
     rep << "\nLanguage special casing (tables 44 upper, 45 lower) and what it cannot carry:\n";
     for (const std::string &line : casingReport) rep << line << "\n";
-    for (const DefObject &o : objects) {
+    for (DefObject &o : objects) {
+      // A language's default sort (body word 2): the one its native rows name.
+      auto sid = sortIds.find(sortOfLanguage(o.name));
+      if (o.type == 0 && sid != sortIds.end() && o.sections.size() == 1 && o.sections[0].size() > 5)
+        set16(o.sections[0], 4, sid->second);
       Bytes file;
       if (!containerFile(o.sections, 2, &file, &err) ||
           !writeFile(outDir + "/" + objectFileName(o.type, o.id), file, &err))

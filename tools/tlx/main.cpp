@@ -23,6 +23,7 @@ const Command kCommands[] = {
     {"format", cmdFormat, "format number|currency [--locale NAME] [--intl] VALUE...  write numbers as a locale does"},
     {"parse", cmdParse, "parse number [--locale NAME] [--money] TEXT...  read numbers written by a locale"},
     {"map", cmdMap, "map --lower|--upper|--full-width|--half-width|--digits [--simple] [--locale NAME] [FILE...]"},
+    {"sort", cmdSort, "sort [--locale NAME] [options] [FILE...]  sort lines by a locale's collation"},
 };
 
 void usage(FILE *out) {

@@ -15,6 +15,7 @@ int cmdDate(int argc, char **argv);
 int cmdFormat(int argc, char **argv);
 int cmdParse(int argc, char **argv);
 int cmdMap(int argc, char **argv);
+int cmdSort(int argc, char **argv);
 
 // The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
 const char *defsDir(const char *given);

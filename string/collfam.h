@@ -1,0 +1,436 @@
+// Collation, written once over the forms of codepage/step.h: stepping a string into
+// collation elements, placing weights into the four level buffers, sort keys, and the
+// comparison with early primary decision.
+#pragma once
+#include <cstdint>
+#include <cstring>
+#include <iterator>
+
+#include "codepage/step.h"
+#include "string/sortbody.h"
+
+namespace vl::coll {
+
+using namespace vl::step;
+using sort::Element;
+using sort::Weights;
+
+constexpr uint32_t kGrain = 8;  // granularity of the work area's parts
+constexpr uint32_t kNoUnit = 0xFFFF;
+constexpr uint32_t kIgnoreCase = 0x80000040u, kIgnoreWidth = 0x80000041u;
+
+inline uint32_t roundUp(uint32_t n) { return (n + kGrain - 1) & ~(kGrain - 1); }
+// Work area of one string of count units: two elements per unit on every level.
+inline uint32_t workSize(uint32_t count) { return roundUp(roundUp(count * 8 + 3) + count * 8); }
+
+inline bool usesSort(const VLLocale *l) {
+  return l->sort && l->sort->section[0] && !(l->flags & VL_LF_BINARY);
+}
+
+// Appends n values at *end (the mark follows) when forward, else inserts them at *mark.
+template <class T>
+void placeRun(T **mark, T **end, const T *v, uint32_t n, bool forward) {
+  if (!forward) std::memmove(*mark + n, *mark, static_cast<size_t>(*end - *mark) * sizeof(T));
+  std::memcpy(forward ? *end : *mark, v, n * sizeof(T));
+  *end += n;
+  if (forward) *mark = *end;
+}
+
+// The four level buffers of one string. The fourth level holds (position, weight) pairs.
+struct Levels {
+  uint16_t *p = nullptr;
+  uint8_t *s = nullptr, *t = nullptr;
+  uint16_t *q = nullptr;
+  uint32_t pn = 0, pm = 0, sn = 0, sm = 0, tn = 0, tm = 0, qn = 0, qm = 0;  // ends and marks
+  uint32_t qSkip = 0;  // 16-bit values left off the front of the fourth level
+  bool noTertiary = false;
+
+  void init(uint8_t *area, uint32_t count) {
+    p = reinterpret_cast<uint16_t *>(area);
+    // One byte of slack before each part lets the key be written over the buffers in order.
+    s = area + count * 4 + 1;
+    t = area + count * 6 + 2;
+    q = reinterpret_cast<uint16_t *>(area + roundUp(count * 8 + 3));
+  }
+  template <class T>
+  static void place(T *buf, uint32_t &end, uint32_t &mark, const T *v, uint32_t n, bool forward) {
+    T *m = buf + mark, *e = buf + end;
+    placeRun(&m, &e, v, n, forward);
+    mark = static_cast<uint32_t>(m - buf);
+    end = static_cast<uint32_t>(e - buf);
+  }
+  // A weight whose level lacks the forward bit goes in at the mark, so a run of them
+  // comes out reversed between forward-placed weights.
+  void insert(const Element &e, uint16_t pos, uint8_t cls) {
+    if (e.primary) place(p, pn, pm, &e.primary, 1, (cls & sort::kFwdPrimary) != 0);
+    if (e.secondary) place(s, sn, sm, &e.secondary, 1, (cls & sort::kFwdSecondary) != 0);
+    if (e.tertiary && !noTertiary) place(t, tn, tm, &e.tertiary, 1, (cls & sort::kFwdTertiary) != 0);
+    if (e.fourth) {
+      const uint16_t pair[2] = {pos, e.fourth};
+      place(q, qn, qm, pair, 2, (cls & sort::kFwdFourth) != 0);
+    }
+  }
+  void insertAll(const Weights &w, int n, uint16_t pos) {
+    for (int i = 0; i < n; ++i) insert(w.e[i], pos, w.cls);
+  }
+  // Trailing default secondaries and tertiaries leave; a key with nothing on the first
+  // three levels starts its fourth level one value late.
+  void finish(const VLObjEntry *sortObj) {
+    const uint8_t *b = sort::body(sortObj);
+    while (sn && s[sn - 1] == b[sort::kDefSec]) --sn;
+    while (tn && t[tn - 1] == b[sort::kDefTer]) --tn;
+    qSkip = (!pn && !sn && !tn && qn) ? 1 : 0;
+  }
+  uint32_t keyLength() const { return pn * 2 + sn + tn + (qn - qSkip) * 2 + 3; }
+  // Writes the key at dst (which may overlap the buffers from below).
+  void write(uint8_t *dst) const {
+    uint8_t *o = dst;
+    for (uint32_t i = 0; i < pn; ++i, o += 2) {
+      const uint16_t v = p[i];
+      o[0] = static_cast<uint8_t>(v >> 8);
+      o[1] = static_cast<uint8_t>(v);
+    }
+    *o++ = 0;
+    std::memmove(o, s, sn);
+    o += sn;
+    *o++ = 0;
+    std::memmove(o, t, tn);
+    o += tn;
+    *o++ = 0;
+    for (uint32_t i = qSkip; i < qn; ++i, o += 2) {
+      const uint16_t v = q[i];
+      o[0] = static_cast<uint8_t>(v >> 8);
+      o[1] = static_cast<uint8_t>(v);
+    }
+  }
+};
+
+// Byte-wise order of two runs of 16-bit values written big-endian, then by length.
+inline int cmp16(const uint16_t *a, uint32_t an, const uint16_t *b, uint32_t bn) {
+  for (uint32_t i = 0; i < an && i < bn; ++i)
+    if (a[i] != b[i]) return a[i] < b[i] ? -1 : 1;
+  return an == bn ? 0 : an < bn ? -1 : 1;
+}
+inline int cmp8(const uint8_t *a, uint32_t an, const uint8_t *b, uint32_t bn) {
+  const int c = std::memcmp(a, b, an < bn ? an : bn);
+  if (c) return c < 0 ? -1 : 1;
+  return an == bn ? 0 : an < bn ? -1 : 1;
+}
+// The order of the two keys these levels would write, without writing them.
+inline int compare(const Levels &a, const Levels &b) {
+  if (int c = cmp16(a.p, a.pn, b.p, b.pn)) return c;
+  if (int c = cmp8(a.s, a.sn, b.s, b.sn)) return c;
+  if (int c = cmp8(a.t, a.tn, b.t, b.tn)) return c;
+  return cmp16(a.q + a.qSkip, a.qn - a.qSkip, b.q + b.qSkip, b.qn - b.qSkip);
+}
+
+// Reads the characters of one string in form F as UTF-16 units and hands out its
+// collation elements, trying each unit with the next for a combination.
+template <class F>
+struct Source {
+  F f;
+  const VLCodePage *cp;
+  const VLObjEntry *so;
+  const U<F> *p;
+  uint32_t rem;          // units of the string left
+  uint32_t counter = 0;  // characters read
+  uint32_t pending = kNoUnit;
+  uint32_t pendingLen = 0;
+
+  // One character as a unit; false at the end or at a character cut by the length.
+  bool read(uint16_t *u, uint32_t *len) {
+    if constexpr (F::kShift) {
+      while (rem && f.isShift(*p)) {
+        f.shift(*p++);
+        --rem;
+      }
+    }
+    if (!rem) return false;
+    if constexpr (F::kUnits) {
+      if constexpr (sizeof(U<F>) == 2)
+        *u = *p;
+      else
+        *u = *p < 0x100 ? cp::sbcsUni(cp, static_cast<uint8_t>(*p)) : cp::wToUni(cp, *p);
+      *len = 1;
+    } else {
+      const uint32_t n = f.len(p);
+      if (n > rem) {
+        rem = 0;
+        return false;
+      }
+      *u = n == 1 ? cp::sbcsUni(cp, *p) : cp::mbToUni(cp, p, n);
+      *len = n;
+    }
+    p += *len;
+    rem -= *len;
+    ++counter;
+    return true;
+  }
+
+  // The next element (0 = none: ignorable, or the end when done() says so). pos gets the
+  // 1-based position of its first character.
+  int next(Weights *w, uint16_t *pos) {
+    uint16_t u;
+    uint32_t len;
+    if (pending != kNoUnit) {
+      u = static_cast<uint16_t>(pending);
+      pending = kNoUnit;
+      *pos = static_cast<uint16_t>(counter);
+    } else {
+      if (!read(&u, &len)) {
+        *w = Weights{};
+        return 0;
+      }
+      *pos = static_cast<uint16_t>(counter);
+    }
+    if (sort::hasCombinations(so)) {
+      uint16_t v;
+      if (read(&v, &len)) {
+        if (sort::combinationOf(so, u, v, w)) return 1;
+        pending = v;
+        *pos = static_cast<uint16_t>(counter - 1);
+      }
+    }
+    return sort::weightsOf(so, u, w);
+  }
+  bool done() const { return pending == kNoUnit && rem == 0; }
+};
+
+// Key of count UTF-16 units into dst; builds in dst when it holds the work area. Returns
+// the key length (also when it did not fit, and nothing was written), -1 without memory.
+inline int32_t genKey(const VLObjEntry *so, uint8_t *dst, uint32_t dstLen, const uint16_t *u, uint32_t count,
+                      bool noTertiary = false) {
+  if (!dst) dstLen = 0;
+  if (count == 0) {
+    if (dstLen > 2) std::memset(dst, 0, 3);
+    return 3;
+  }
+  const uint32_t need = workSize(count);
+  const uint32_t skip = dst ? (kGrain - reinterpret_cast<uintptr_t>(dst) % kGrain) % kGrain : 0;
+  const bool inPlace = dstLen > skip && dstLen - skip >= need;
+  Block<uint8_t> own(inPlace ? nullptr : static_cast<uint8_t *>(alloc(need)));
+  if (!inPlace && !own) return -1;
+  uint8_t *area = inPlace ? dst + skip : own.get();
+  Levels lv;
+  lv.init(area, count);
+  lv.noTertiary = noTertiary;
+  Weights w;
+  for (uint32_t i = 0; i < count; ++i) {
+    const auto pos = static_cast<uint16_t>(i + 1);
+    if (sort::hasCombinations(so) && i + 1 < count && sort::combinationOf(so, u[i], u[i + 1], &w)) {
+      lv.insertAll(w, 1, pos);
+      ++i;
+      continue;
+    }
+    lv.insertAll(w, sort::weightsOf(so, u[i], &w), pos);
+  }
+  lv.finish(so);
+  const uint32_t len = lv.keyLength();
+  if (len <= dstLen) {
+    lv.write(dst);
+    if (inPlace) std::memset(dst + len, 0, dstLen - len);
+  }
+  return static_cast<int32_t>(len);
+}
+
+// Walks both strings at once, deciding on the first primary difference while every
+// primary so far was placed forward; otherwise compares the finished levels.
+template <class F>
+int compareWalk(Source<F> a, Source<F> b, Levels &la, Levels &lb) {
+  bool early = true;
+  Weights wa, wb;
+  int na = 0, nb = 0, ia = 0, ib = 0;  // elements of the current unit, and the one up
+  uint16_t pa = 0, pb = 0;
+  auto pull = [&](Source<F> &s, Weights &w, int &n, int &i, uint16_t &pos) {
+    // The next element with weights, or false at the end.
+    for (;;) {
+      if (i + 1 < n) {
+        ++i;
+        return true;
+      }
+      if (s.done()) return false;
+      n = s.next(&w, &pos);
+      i = 0;
+      if (n) return true;
+    }
+  };
+  bool haveA = pull(a, wa, na, ia, pa), haveB = pull(b, wb, nb, ib, pb);
+  while (haveA || haveB) {
+    const Element *ea = haveA ? &wa.e[ia] : nullptr;
+    const Element *eb = haveB ? &wb.e[ib] : nullptr;
+    if (early && ((ea && ea->primary && !(wa.cls & sort::kFwdPrimary)) ||
+                  (eb && eb->primary && !(wb.cls & sort::kFwdPrimary))))
+      early = false;
+    const bool primA = ea && ea->primary, primB = eb && eb->primary;
+    if (early) {
+      if (primA && primB && ea->primary != eb->primary) return ea->primary < eb->primary ? -1 : 1;
+      if (primA && !haveB) return 1;
+      if (primB && !haveA) return -1;
+    }
+    // Align on primary-bearing elements: one without a primary moves alone.
+    const bool stepA = haveA && (!primA || primB || !haveB);
+    const bool stepB = haveB && (!primB || primA || !haveA);
+    if (stepA) {
+      la.insert(*ea, pa, wa.cls);
+      haveA = pull(a, wa, na, ia, pa);
+    }
+    if (stepB) {
+      lb.insert(*eb, pb, wb.cls);
+      haveB = pull(b, wb, nb, ib, pb);
+    }
+  }
+  la.finish(a.so);
+  lb.finish(b.so);
+  if (early) la.pn = lb.pn = 0;  // equal: both walked every primary alike
+  return compare(la, lb);
+}
+
+}  // namespace vl::coll
+
+namespace vl::coll {
+
+// Case and width distinctions live on the tertiary level of the generated sorts, so the
+// case- and width-blind options leave that level out.
+inline bool optionsOk(uint32_t o) { return o == 0 || o == kIgnoreCase || o == kIgnoreWidth; }
+
+template <class F>
+uint32_t unitLen(F f, const U<F> *s, int32_t len, uint32_t opts) {
+  if (len < 0) return length(s);
+  if ((opts & VL_OPT_CHARLEN) && !F::kUnits) return unitsOf(f, s, static_cast<uint32_t>(len));
+  return static_cast<uint32_t>(len);
+}
+
+// Binary order: the units themselves, big-endian.
+template <class T>
+int32_t binaryKey(uint8_t *dst, uint32_t dstLen, const T *s, uint32_t n) {
+  const uint32_t len = n * static_cast<uint32_t>(sizeof(T) == 1 ? 1 : 2);
+  if (len <= dstLen) {
+    for (uint32_t i = 0; i < n; ++i) {
+      if constexpr (sizeof(T) == 1)
+        dst[i] = s[i];
+      else
+        dst[2 * i] = static_cast<uint8_t>(s[i] >> 8), dst[2 * i + 1] = static_cast<uint8_t>(s[i]);
+    }
+  }
+  return static_cast<int32_t>(len);
+}
+template <class T>
+int binaryCompare(const T *a, uint32_t an, const T *b, uint32_t bn) {
+  for (uint32_t i = 0; i < an && i < bn; ++i)
+    if (a[i] != b[i]) return a[i] < b[i] ? -1 : 1;
+  return an == bn ? 0 : an < bn ? -1 : 1;
+}
+
+template <class F>
+int32_t xfrm(VLLocale *l, F f, uint8_t *dst, int32_t dstLen, const U<F> *src, int32_t srcLen, uint32_t opts) {
+  opts &= ~VL_OPT_CHARLEN;
+  if (!optionsOk(opts) || !src) {
+    setRc(l, VL_RC_BADARG);
+    return -1;
+  }
+  const uint32_t room = dst && dstLen > 0 ? static_cast<uint32_t>(dstLen) : 0;
+  const uint32_t n = srcLen < 0 ? length(src) : static_cast<uint32_t>(srcLen);
+  setRc(l, VL_RC_OK);
+  if (!usesSort(l)) return binaryKey(dst, room, src, n);
+  if (n == 0) {
+    if (room) std::memset(dst, 0, room < 3 ? room : 3);
+    return 3;
+  }
+  // Short strings keep their units on the stack.
+  uint16_t small[128];
+  const bool onStack = n <= std::size(small);
+  Block<uint16_t> own(onStack ? nullptr : static_cast<uint16_t *>(alloc(size_t{n} * 4)));
+  if (!onStack && !own) {
+    setRc(l, VL_RC_NOMEM);
+    return -1;
+  }
+  uint16_t *units = onStack ? small : own.get();
+  Source<F> s{f, l->codePage, l->sort, src, n};
+  uint32_t count = 0, len;
+  uint16_t u;
+  while (s.read(&u, &len)) units[count++] = u;
+  const int32_t k = genKey(l->sort, dst, room, units, count, opts != 0);
+  if (k < 0) setRc(l, VL_RC_NOMEM);
+  return k;
+}
+
+// Drops trailing blanks (and the ideographic one where units are Unicode).
+template <class F>
+uint32_t trimBlanks(const U<F> *s, uint32_t n) {
+  while (n && (s[n - 1] == 0x20 || (F::kUnits && s[n - 1] == 0x3000))) --n;
+  return n;
+}
+
+template <class F>
+int coll(VLLocale *l, F fa, const U<F> *a, int32_t alen, F fb, const U<F> *b, int32_t blen, uint32_t opts) {
+  setRc(l, VL_RC_OK);
+  if (!a || !b) return a ? 1 : b ? -1 : 0;
+  uint32_t an = unitLen(fa, a, alen, opts), bn = unitLen(fb, b, blen, opts);
+  if (opts & 0x01) {
+    an = trimBlanks<F>(a, an);
+    bn = trimBlanks<F>(b, bn);
+  }
+  const bool noTertiary = (opts & kIgnoreCase) == kIgnoreCase;
+  if (!usesSort(l)) return binaryCompare(a, an, b, bn);
+  const uint32_t na = workSize(an ? an : 1), nb = workSize(bn ? bn : 1);
+  // Typical words fit on the stack; only long strings take the allocation hook.
+  alignas(8) uint8_t stack[2048];
+  const bool onStack = na + nb <= sizeof stack;
+  Block<uint8_t> own(onStack ? nullptr : static_cast<uint8_t *>(alloc(na + nb)));
+  if (!onStack && !own) {
+    setRc(l, VL_RC_NOMEM);
+    return 0;
+  }
+  uint8_t *area = onStack ? stack : own.get();
+  Levels la, lb;
+  la.init(area, an ? an : 1);
+  lb.init(area + na, bn ? bn : 1);
+  la.noTertiary = lb.noTertiary = noTertiary;
+  return compareWalk(Source<F>{fa, l->codePage, l->sort, a, an}, Source<F>{fb, l->codePage, l->sort, b, bn}, la, lb);
+}
+
+}  // namespace vl::coll
+
+namespace vl::coll {
+
+// Hands an element pair out through the nine optional pointers of the public lookups.
+inline int handOut(const Weights &w, int n, uint16_t *p1, uint8_t *s1, uint8_t *t1, uint16_t *q1, uint16_t *p2,
+                   uint8_t *s2, uint8_t *t2, uint16_t *q2, uint8_t *cls) {
+  const Element none{};
+  const Element &a = n >= 1 ? w.e[0] : none, &b = n >= 2 ? w.e[1] : none;
+  if (p1) *p1 = a.primary;
+  if (s1) *s1 = a.secondary;
+  if (t1) *t1 = a.tertiary;
+  if (q1) *q1 = a.fourth;
+  if (p2) *p2 = b.primary;
+  if (s2) *s2 = b.secondary;
+  if (t2) *t2 = b.tertiary;
+  if (q2) *q2 = b.fourth;
+  if (cls) *cls = n ? w.cls : 0;
+  return n;
+}
+
+// One step of the public walk: the caller keeps pointer, remaining, counter and pending.
+template <class F>
+int nextWeight(VLLocale *locale, F f, const U<F> **str, int32_t *remaining, uint32_t *counter, uint16_t *p1,
+               uint8_t *s1, uint8_t *t1, uint16_t *q1, uint16_t *p2, uint8_t *s2, uint8_t *t2, uint16_t *q2,
+               uint8_t *cls, uint16_t *pending, uint32_t *state = nullptr) {
+  Weights w;
+  VLLocale *l = use(locale);
+  if (!l || !str || !*str || !remaining || *remaining < 0 || !usesSort(l))
+    return handOut(w, 0, p1, s1, t1, q1, p2, s2, t2, q2, cls);
+  Source<F> s{f, l->codePage, l->sort, *str, static_cast<uint32_t>(*remaining)};
+  if (state) s.f.state = *state;
+  if (counter) s.counter = *counter;
+  if (pending) s.pending = *pending;
+  uint16_t pos;
+  const int n = s.next(&w, &pos);
+  *str = s.p;
+  *remaining = static_cast<int32_t>(s.rem);
+  if (counter) *counter = s.counter;
+  if (pending) *pending = static_cast<uint16_t>(s.pending);
+  if (state) *state = s.f.state;
+  return handOut(w, n, p1, s1, t1, q1, p2, s2, t2, q2, cls);
+}
+
+}  // namespace vl::coll

@@ -1,0 +1,194 @@
+// Generated sorts against the C library: every pair of a word list of the language is
+// ordered by VLStrcoll and by strcoll_l of the same locale built with localedef, and
+// VLStrxfrm keys compared byte-wise give exactly VLStrcoll's order.
+#include <gtest/gtest.h>
+#include <locale.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <cstring>
+#include <filesystem>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "support/defdir.h"
+#include "support/hooks.h"
+#include "veltrin.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+// Words every list shares: case pairs, punctuation, digits, spaces.
+const std::vector<std::string> kCommon = {
+    "apple",  "Apple",  "APPLE", "apples", "apple pie", "apple-pie", "applepie", "a",     "A",   "b",
+    "B",      "zebra",  "Zebra", "co-op",  "coop",      "co op",     "e-mail",   "email", "1st", "2nd",
+    "10",     "9",      "100",   "x1",     "x10",       "x2",        "ab.cd",    "abcd",  "ab,c", "O'Brien",
+    "Obrien", "resume", "naive", "role",   "cafe",      "Zurich",    "zoo",      "yacht", "year", "young",
+};
+
+struct Lang {
+  const char *sort;     // generated sort
+  const char *native;   // C library locale source
+  const char *locale;   // library locale name
+  double minimum;       // share of pairs ordered alike this sort reaches
+  std::vector<std::string> words;
+};
+
+const std::vector<Lang> kLangs = {
+    {"Default", "en_US", "English_UnitedStates.UTF-8", 99.68,
+     {"résumé", "resumé", "naïve", "rôle", "café", "Café", "cafés", "façade", "facade", "über", "Zürich", "coöperate",
+      "élan", "Élan", "elan", "déjà", "deja", "piñata", "pinata", "æon", "aeon", "straße", "strasse"}},
+    {"Swedish", "sv_SE", "Swedish_Sweden.UTF-8", 99.69,
+     {"år", "Åre", "ärlig", "Ärla", "öga", "Öland", "ost", "oxe", "zebra", "ände", "åska", "yxa", "über", "vägg",
+      "wagon", "väder", "ödla", "ålder", "älg", "öl", "ära", "Västerås", "Malmö", "Göteborg"}},
+    {"Danish", "da_DK", "Danish_Denmark.UTF-8", 99.65,
+     {"æble", "Æble", "øl", "Øresund", "år", "Aarhus", "aarhus", "Aalborg", "ål", "ørn", "zoo", "ærlig", "yngre",
+      "åben", "ønske", "Ålborg", "vej", "bøger", "blå", "bæk"}},
+    {"Norwegian", "nb_NO", "Norwegian_Norway.UTF-8", 99.61,
+     {"æble", "øy", "Østfold", "år", "Aasen", "ål", "ørn", "zoo", "ærlig", "yngre", "åpen", "ønske", "Ålesund",
+      "vei", "bøker", "blå", "bær"}},
+    {"Finnish", "fi_FI", "Finnish_Finland.UTF-8", 99.63,
+     {"äiti", "Äänekoski", "öljy", "Öljy", "yö", "vaara", "waara", "zeta", "åbo", "ääni", "öisin", "yksi", "Vaasa",
+      "Wasa", "työ", "tyyni", "sää", "saari"}},
+    {"Spanish", "es_ES", "Spanish_Spain.UTF-8", 99.78,
+     {"ñandú", "Ñandú", "nube", "nuez", "ñu", "oso", "niño", "nino", "canción", "cancion", "llama", "lluvia",
+      "luz", "chico", "cigarro", "cuna", "pañuelo", "panuelo", "año", "anzuelo", "árbol", "arbol"}},
+    {"Czech", "cs_CZ", "Czech_CzechRepublic.UTF-8", 99.68,
+     {"chléb", "Chrudim", "hrad", "ihned", "čas", "Čech", "cena", "dům", "řeka", "Řím", "rak", "šest", "sestra",
+      "žena", "zima", "ďábel", "ťava", "úterý", "ucho", "ůl", "kůň", "Chomutov", "cihla"}},
+    {"Slovak", "sk_SK", "Slovak_Slovakia.UTF-8", 99.66,
+     {"chlieb", "hrad", "ihla", "čas", "cena", "ďakujem", "dom", "ľad", "lano", "ňaňa", "ôsmy", "osem", "šesť",
+      "sestra", "žena", "zima", "ťava", "Chorvátsko", "ruža", "ŕba", "äno"}},
+    {"Polish", "pl_PL", "Polish_Poland.UTF-8", 99.78,
+     {"ąb", "ab", "ćma", "cma", "ęka", "ekran", "łza", "lza", "ńo", "nos", "ósmy", "osa", "śnieg", "sen", "źdźbło",
+      "żaba", "zaba", "Łódź", "Lodz", "Żółw", "Źródło", "zebra"}},
+    {"Hungarian", "hu_HU", "Hungarian_Hungary.UTF-8", 99.69,
+     {"cukor", "csak", "Csaba", "dzéta", "dzsungel", "gyár", "gazda", "lyuk", "lakás", "nyár", "nap", "szép",
+      "sas", "tyúk", "tál", "zsák", "zaj", "öröm", "őz", "ül", "űr", "ujj", "ötlet", "ősz"}},
+    {"Croatian", "hr_HR", "Croatian_Croatia.UTF-8", 99.63,
+     {"čaj", "ćevapi", "cesta", "dah", "džep", "đak", "Đakovo", "ljubav", "lopta", "njiva", "nos", "šuma", "sunce",
+      "žaba", "zima", "Dubrovnik", "Džakarta", "Ljubljana"}},
+    {"Lithuanian", "lt_LT", "English_UnitedStates.UTF-8@Lithuanian", 99.65,
+     {"ąžuolas", "arklys", "čia", "ciklas", "ęsti", "ėjo", "eglė", "įėjimas", "yra", "ilgas", "jūra", "šuo", "saulė",
+      "ūkis", "ųsas", "uola", "žuvis", "zuikis", "Vilnius", "Kaunas"}},
+    {"Estonian", "et_EE", "English_UnitedStates.UTF-8@Estonian", 99.61,
+     {"šokolaad", "sõber", "saag", "zooloog", "žürii", "tee", "õun", "ära", "öö", "üks", "wagun", "vesi", "Tallinn",
+      "Tartu", "Pärnu", "Võru", "Türi"}},
+    {"Turkish", "tr_TR", "Turkish_Turkey.UTF-8", 99.64,
+     {"ılık", "Irmak", "ikiz", "İstanbul", "çay", "cam", "Çanakkale", "ğ", "gül", "öğle", "ocak", "şeker", "su",
+      "üzüm", "uzun", "Izmir", "İzmir", "kız", "kiz"}},
+    {"Icelandic", "is_IS", "Icelandic_Iceland.UTF-8", 99.67,
+     {"á", "ás", "að", "ðe", "dagur", "é", "eldur", "í", "ís", "ó", "ós", "ú", "út", "ý", "ýsa", "þú", "þorn",
+      "æ", "ævi", "ö", "örn", "zebra"}},
+    {"Slovenian", "sl_SI", "Slovenian_Slovenia.UTF-8", 99.55,
+     {"čaj", "cesta", "šola", "sonce", "žaba", "zima", "ćevapčiči", "dan", "đak", "Ljubljana", "Maribor",
+      "Celje", "Čatež"}},
+};
+
+std::string oracleDir() { return (fs::path(VL_TEST_DEFS_DIR).parent_path() / "coll-oracle").string(); }
+
+// Builds the C library locale once per build tree; localedef is slow on the full table.
+bool buildOracle(const std::string &native) {
+  const std::string dir = oracleDir();
+  fs::create_directories(dir);
+  const std::string target = dir + "/" + native + ".UTF-8";
+  if (fs::exists(target + "/LC_COLLATE")) return true;
+  const std::string cmd = "localedef -c -i " + native + " -f UTF-8 " + target + " >/dev/null 2>&1";
+  return std::system(cmd.c_str()) >= 0 && fs::exists(target + "/LC_COLLATE");
+}
+
+int sign(int v) { return (v > 0) - (v < 0); }
+
+class CollateOracle : public ::testing::TestWithParam<Lang> {};
+
+TEST_P(CollateOracle, AgreesWithTheCLibrary) {
+  const Lang &lang = GetParam();
+  if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
+  if (!buildOracle(lang.native)) GTEST_SKIP() << "localedef could not build " << lang.native;
+  setenv("LOCPATH", oracleDir().c_str(), 1);
+  locale_t c = newlocale(LC_COLLATE_MASK, (std::string(lang.native) + ".UTF-8").c_str(), nullptr);
+  unsetenv("LOCPATH");
+  ASSERT_NE(c, nullptr);
+  ts::Library lib(VL_TEST_DEFS_DIR);
+  uint32_t rc;
+  std::string name = lang.locale;
+  if (name.find('@') == std::string::npos) name += std::string("@") + lang.sort;
+  VLLocale *l = VLGetLocale(name.c_str(), 0, &rc);
+  ASSERT_NE(l, nullptr) << name << " rc " << rc;
+  ASSERT_NE(l->sort, nullptr);
+
+  std::vector<std::string> words = kCommon;
+  words.insert(words.end(), lang.words.begin(), lang.words.end());
+  std::vector<std::string> keys;
+  for (const std::string &w : words) {
+    const int32_t n = VLStrxfrm(l, nullptr, 0, w.c_str(), -1, 0);
+    ASSERT_GT(n, 0) << w;
+    std::string k(static_cast<size_t>(n), '\0');
+    ASSERT_EQ(VLStrxfrm(l, k.data(), n, w.c_str(), -1, 0), n);
+    keys.push_back(k);
+  }
+  size_t pairs = 0, alike = 0;
+  std::string differ;
+  for (size_t i = 0; i < words.size(); ++i) {
+    for (size_t j = i + 1; j < words.size(); ++j) {
+      const int ours = sign(VLStrcoll(l, words[i].c_str(), -1, words[j].c_str(), -1, 0));
+      const int theirs = sign(strcoll_l(words[i].c_str(), words[j].c_str(), c));
+      EXPECT_EQ(sign(keys[i].compare(keys[j])), ours) << words[i] << " / " << words[j];
+      ++pairs;
+      if (ours == theirs) ++alike;
+      else if (differ.size() < 400) differ += " [" + words[i] + " " + words[j] + "]";
+    }
+  }
+  const double share = 100.0 * static_cast<double>(alike) / static_cast<double>(pairs);
+  std::printf("%-10s %5zu pairs, %6.2f%% ordered alike\n", lang.sort, pairs, share);
+  RecordProperty("agreement", std::to_string(share));
+  EXPECT_GE(share, lang.minimum) << "differ:" << differ;
+  VLReleaseLocale(l);
+  freelocale(c);
+}
+
+INSTANTIATE_TEST_SUITE_P(Sorts, CollateOracle, ::testing::ValuesIn(kLangs),
+                         [](const auto &info) { return std::string(info.param.sort); });
+
+}  // namespace
+
+namespace {
+
+// tlx sort: the order of a Swedish list, the options, and the status of bad input.
+TEST(TlxSort, SortsLinesByCollation) {
+  if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
+  ts::TempDir d;
+  {
+    FILE *f = std::fopen(d.file("in.txt").c_str(), "w");
+    std::fputs("\xc3\x96l\nzebra\nApple\n\xc3\xa5sna\napple\n\xc3\x84pple\nazur\n", f);  // Öl åsna Äpple
+    std::fclose(f);
+  }
+  struct Case {
+    const char *args, *out;
+    int status;
+  } cases[] = {
+      {"--locale Swedish_Sweden.UTF-8", "apple Apple azur zebra \xc3\xa5sna \xc3\x84pple \xc3\x96l ", 0},
+      {"--locale Swedish_Sweden.UTF-8 --reverse", "\xc3\x96l \xc3\x84pple \xc3\xa5sna zebra azur Apple apple ", 0},
+      {"--locale Swedish_Sweden.UTF-8 --ignore-case --unique", "Apple azur zebra \xc3\xa5sna \xc3\x84pple \xc3\x96l ", 0},
+      {"--locale English_UnitedStates.UTF-8", "apple Apple \xc3\x84pple \xc3\xa5sna azur \xc3\x96l zebra ", 0},
+      {"--locale Nowhere", "", 2},
+      {"--bogus", "", 2},
+  };
+  for (const Case &c : cases) {
+    const std::string cmd = std::string(VL_TEST_TLX) + " sort --dir " + VL_TEST_DEFS_DIR + " " + c.args + " " +
+                            d.file("in.txt") + " 2>/dev/null";
+    FILE *p = popen(cmd.c_str(), "r");
+    ASSERT_NE(p, nullptr);
+    char buf[512];
+    std::string out;
+    while (std::fgets(buf, sizeof buf, p)) out += buf;
+    std::replace(out.begin(), out.end(), '\n', ' ');
+    const int st = pclose(p);
+    EXPECT_EQ(out, c.out) << c.args;
+    EXPECT_EQ(WEXITSTATUS(st), c.status) << c.args;
+  }
+}
+
+}  // namespace
