@@ -1,7 +1,8 @@
 // One step of the number reader over the tokens of VLStrGetDigit.
 #include "format/numfam.h"
 
-VL_TRACE_MODULE("vldblnst");
+// A step is too small to trace; the record is kept for the module flags.
+[[maybe_unused]] VL_TRACE_MODULE("vldblnst");
 
 int32_t VLStrDoubleNextState(int32_t state, int32_t token, double *value, int32_t *sign, int32_t *fractionExponent,
                              int32_t *exponentSign, int32_t *exponent) {

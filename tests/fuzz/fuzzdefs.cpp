@@ -5,6 +5,7 @@
 #include <cstring>
 #include <dirent.h>
 #include <unistd.h>
+#include <ctime>
 #include <vector>
 
 namespace fuzz {
@@ -82,6 +83,32 @@ void workout(VLLocale *l, const uint8_t *text, size_t size) {
   VLStrcpy(l, buf, sizeof buf, s.data(), int32_t(size), 0);
   VLStrcpy(l, buf, 4, s.data(), int32_t(size), VL_OPT_NULLTERM);
   VLStrspn(l, s.data(), int32_t(size), " ,.", 3, 0);
+
+  // The families built on the handle: mapping, comparison, collation, numbers, times.
+  std::vector<char> mapped(size * 3 + 4);
+  VLMapString(l, mapped.data(), int32_t(mapped.size()), s.data(), int32_t(size), VL_MAP_UPPER);
+  VLMapString(l, mapped.data(), 3, s.data(), int32_t(size), VL_MAP_LOWER);
+  const char other[] = "Stra\xDF" "e";
+  VLStrcmp(l, s.data(), int32_t(size), other, 6, VL_CMP_NOWIDTH);
+  VLStrcoll(l, s.data(), int32_t(size), other, 6, 0);
+  VLStrcoll(l, s.data(), int32_t(size), s.data(), int32_t(size / 2), VL_COLL_IGNORECASE);
+  std::vector<char> key(size * 12 + 16);
+  VLStrxfrm(l, key.data(), int32_t(key.size()), s.data(), int32_t(size), 0);
+  VLStrxfrm(l, key.data(), 5, s.data(), int32_t(size), 0);
+  VLStrstr(l, s.data(), int32_t(size), "ab", 2, VL_COLL_IGNORECASE);
+  VLLongToString(l, -1234567, buf, sizeof buf, 0);
+  VLLongToString(l, 2147483647, buf, 4, 0);
+  VLCurrencyToString(l, buf, sizeof buf, 0, -1234.567);
+  VLDoubleToString(l, 98765.4321, buf, 6, 0);
+  char *end = nullptr;
+  VLStringToLong(l, s.data(), int32_t(size), &end, 0, 0);
+  VLStringToDouble(l, s.data(), int32_t(size), &end, 0);
+  struct tm t {};
+  t.tm_year = 126, t.tm_mon = 10, t.tm_mday = 23, t.tm_hour = 13, t.tm_min = 5, t.tm_wday = 1, t.tm_yday = 326;
+  VLTimeToString(l, &t, buf, sizeof buf, "%c|%x|%X|%A %B %p", -1, 0);
+  VLTimeToString(l, &t, buf, 7, "%#c", -1, 0);
+  struct tm back = t;
+  VLStringToTime(l, &back, s.data(), int32_t(size), "%x", -1, 0);
 }
 
 }  // namespace fuzz

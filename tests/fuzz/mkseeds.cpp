@@ -70,6 +70,18 @@ int main(int argc, char **argv) {
                  samples[s % 4]);
   for (unsigned char s = 0; s < 14; s += 3)
     ok &= text(out + "/translate", "t" + std::to_string(s), {0, s, 0x03, 40, 1}, samples[s % 4]);
+  const char *sorts[] = {"so_00001.nls", "so_00002.nls", "so_00010.nls"};
+  for (int i = 0; i < 3; ++i) ok &= seed(out + "/sort", sorts[i], i, sorts[i], defs);
+  const std::string times[][2] = {{"%c", "Fri Dec 31 23:59:59 1999"}, {"%x %X", "12/31/99 23:59:59"},
+                                  {"%A %d %B %Y %#I %p", "Friday 31 December 1999 11 PM"},
+                                  {"%Y-%m-%d %H:%M:%S %j %%", "1999-12-31 23:59:59 364 %"}};
+  for (unsigned char i = 0; i < 4; ++i)
+    for (unsigned char loc = 0; loc < 4; ++loc)
+      ok &= text(out + "/timetext", "t" + std::to_string(i) + "_" + std::to_string(loc),
+                 {loc, static_cast<unsigned char>(times[i][0].size())}, times[i][0] + times[i][1]);
+  const std::string numbers[] = {"-1.234.567", "  +0x7fffffff", "12,345.678e3", "4294967296", "1.234,56 \x80"};
+  for (unsigned char i = 0; i < 5; ++i)
+    ok &= text(out + "/number", "n" + std::to_string(i), {i, 10, 0x39, 0x30, 0x20, 0x10, 20}, numbers[i]);
   catfile::Catalog cat;
   cat.locale = "German_Germany.MS1252";
   cat.sets[1] = {{1, "Datei nicht gefunden"}, {2, "Gr\xFC\xDF" "e"}, {7, ""}};
