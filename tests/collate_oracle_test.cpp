@@ -2,6 +2,7 @@
 // ordered by VLStrcoll and by strcoll_l of the same locale built with localedef, and
 // VLStrxfrm keys compared byte-wise give exactly VLStrcoll's order.
 #include <gtest/gtest.h>
+#include <iconv.h>
 #include <locale.h>
 
 #include <algorithm>
@@ -70,12 +71,18 @@ const std::vector<Lang> kLangs = {
     {"Croatian", "hr_HR", "Croatian_Croatia.UTF-8", 99.63,
      {"čaj", "ćevapi", "cesta", "dah", "džep", "đak", "Đakovo", "ljubav", "lopta", "njiva", "nos", "šuma", "sunce",
       "žaba", "zima", "Dubrovnik", "Džakarta", "Ljubljana"}},
-    {"Lithuanian", "lt_LT", "English_UnitedStates.UTF-8@Lithuanian", 99.65,
+    {"Lithuanian", "lt_LT", "Lithuanian_Lithuania.UTF-8", 99.65,
      {"ąžuolas", "arklys", "čia", "ciklas", "ęsti", "ėjo", "eglė", "įėjimas", "yra", "ilgas", "jūra", "šuo", "saulė",
       "ūkis", "ųsas", "uola", "žuvis", "zuikis", "Vilnius", "Kaunas"}},
-    {"Estonian", "et_EE", "English_UnitedStates.UTF-8@Estonian", 99.61,
+    {"Estonian", "et_EE", "Estonian_Estonia.UTF-8", 99.61,
      {"šokolaad", "sõber", "saag", "zooloog", "žürii", "tee", "õun", "ära", "öö", "üks", "wagun", "vesi", "Tallinn",
       "Tartu", "Pärnu", "Võru", "Türi"}},
+    {"Latvian", "lv_LV", "Latvian_Latvia.UTF-8", 99.65,
+     {"čaula", "cena", "ģimene", "gads", "ķirsis", "kaķis", "ļoti", "lapa", "ņaudēt", "nauda", "šis", "sala",
+      "žurka", "zeme", "āboli", "ēst", "īss", "ūdens", "Rīga", "Liepāja"}},
+    {"Ukrainian", "uk_UA", "Ukrainian_Ukraine.UTF-8", 99.66,
+     {"гай", "ґава", "Ґанок", "дім", "єнот", "Європа", "жук", "іній", "їжак", "йод", "ирій", "киян", "ь", "юнак",
+      "яма", "Київ", "Львів", "ялинка", "щука", "шапка", "ёлка"}},
     {"Turkish", "tr_TR", "Turkish_Turkey.UTF-8", 99.64,
      {"ılık", "Irmak", "ikiz", "İstanbul", "çay", "cam", "Çanakkale", "ğ", "gül", "öğle", "ocak", "şeker", "su",
       "üzüm", "uzun", "Izmir", "İzmir", "kız", "kiz"}},
@@ -151,6 +158,64 @@ TEST_P(CollateOracle, AgreesWithTheCLibrary) {
 
 INSTANTIATE_TEST_SUITE_P(Sorts, CollateOracle, ::testing::ValuesIn(kLangs),
                          [](const auto &info) { return std::string(info.param.sort); });
+
+std::string encode(const std::string &utf8, const char *charset) {
+  iconv_t cd = iconv_open(charset, "UTF-8");
+  if (cd == reinterpret_cast<iconv_t>(-1)) return {};
+  std::string in = utf8, out(utf8.size() * 4, '\0');
+  char *ip = in.data(), *op = out.data();
+  size_t il = in.size(), ol = out.size();
+  const bool ok = iconv(cd, &ip, &il, &op, &ol) != static_cast<size_t>(-1);
+  iconv_close(cd);
+  return ok ? out.substr(0, out.size() - ol) : std::string();
+}
+
+// A locale name without "@sort" collates by its language's sort in the language's own
+// code page, in the C library's order for the same words.
+TEST(CollateLanguageDefault, OrdersWordsAsTheLanguage) {
+  struct Case {
+    const char *locale, *charset, *sort, *native;
+    std::vector<std::string> ordered;
+  };
+  const Case cases[] = {
+      {"Lithuanian_Lithuania.MS1257", "CP1257", "Lithuanian", "lt_LT",
+       {"ilgas", "Ilgas", "įėjimas", "yra", "jūra", "saulė", "šuo", "uola", "ųsas", "ūkis", "zuikis", "žuvis"}},
+      {"Estonian_Estonia.MS1257", "CP1257", "Estonian", "et_EE",
+       {"saag", "šokolaad", "zooloog", "žürii", "tee", "vesi", "wagun", "õun", "ära", "öö", "üks", "xenon"}},
+      {"Latvian_Latvia.ISO-8859-13", "ISO-8859-13", "Latvian", "lv_LV",
+       {"cena", "čaula", "gads", "ģimene", "kaķis", "ķirsis", "sala", "šis", "zeme", "žurka"}},
+      {"Ukrainian_Ukraine.KOI8-U", "KOI8-U", "Ukrainian", "uk_UA",
+       {"гай", "ґава", "дім", "єнот", "жук", "ирій", "іній", "їжак", "йод", "юнак", "яма"}},
+      {"Catalan_Spain.Latin1", "ISO-8859-1", "Spanish", "ca_ES", {"nube", "nuez", "ñu", "oso"}},
+  };
+  if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
+  ts::Library lib(VL_TEST_DEFS_DIR);
+  for (const Case &c : cases) {
+    uint32_t rc;
+    VLLocale *l = VLGetLocale(c.locale, 0, &rc);
+    ASSERT_NE(l, nullptr) << c.locale << " rc " << rc;
+    ASSERT_NE(l->sort, nullptr) << c.locale;
+    EXPECT_STREQ(l->sort->name, c.sort) << c.locale;
+    locale_t oracle = nullptr;
+    if (buildOracle(c.native)) {
+      setenv("LOCPATH", oracleDir().c_str(), 1);
+      oracle = newlocale(LC_COLLATE_MASK, (std::string(c.native) + ".UTF-8").c_str(), nullptr);
+      unsetenv("LOCPATH");
+    }
+    for (size_t i = 0; i + 1 < c.ordered.size(); ++i) {
+      const std::string a = encode(c.ordered[i], c.charset), b = encode(c.ordered[i + 1], c.charset);
+      ASSERT_FALSE(a.empty() || b.empty()) << c.ordered[i];
+      EXPECT_LT(VLStrcoll(l, a.c_str(), -1, b.c_str(), -1, 0), 0)
+          << c.locale << ": " << c.ordered[i] << " before " << c.ordered[i + 1];
+      if (oracle) {
+        EXPECT_LT(strcoll_l(c.ordered[i].c_str(), c.ordered[i + 1].c_str(), oracle), 0)
+            << c.native << ": " << c.ordered[i] << " before " << c.ordered[i + 1];
+      }
+    }
+    if (oracle) freelocale(oracle);
+    VLReleaseLocale(l);
+  }
+}
 
 }  // namespace
 

@@ -32,6 +32,7 @@ const NatRow kNat[] = {
 const std::map<std::string, uint16_t> kCpIds = {
     {"US-ASCII", 367}, {"Latin1", 819},     {"ISO-8859-2", 912}, {"ISO-8859-5", 915},
     {"MS949", 1363},   {"MS950", 1370},     {"JapanEUC", 954},   {"UTF-8", 1208},
+    {"ISO-8859-13", 921}, {"KOI8-U", 1168},
 };
 uint16_t cpId(const std::string &name) {
   auto it = kCpIds.find(name);
@@ -108,6 +109,27 @@ TEST_F(Generated, EveryLanguageAndTerritoryOnce) {
   EXPECT_EQ(get(1, "Yugoslavia").id, 891);
 }
 
+// Ids once given never move: the first table's languages keep their alphabetical
+// numbers and the ones added later follow in the order they were added.
+TEST_F(Generated, LanguageIdsNeverMove) {
+  const std::pair<const char *, uint16_t> ids[] = {
+      {"English", 1},     {"Arabic", 2},           {"Bulgarian", 3},    {"Croatian", 4},   {"Czech", 5},
+      {"Danish", 6},      {"Dutch", 7},            {"Finnish", 8},      {"French", 9},     {"German", 10},
+      {"Greek", 11},      {"Hebrew", 12},          {"Hungarian", 13},   {"Icelandic", 14}, {"Italian", 15},
+      {"Japanese", 16},   {"Korean", 17},          {"Macedonian", 18},  {"Norwegian", 19}, {"Polish", 20},
+      {"Portuguese", 21}, {"Romanian", 22},        {"Russian", 23},     {"Serbian", 24},
+      {"SerboCroatian", 25}, {"SimplifiedChinese", 26}, {"Slovak", 27},    {"Slovenian", 28}, {"Spanish", 29},
+      {"Swedish", 30},    {"Thai", 31},            {"TraditionalChinese", 32}, {"Turkish", 33},
+      {"Lithuanian", 34}, {"Estonian", 35},        {"Latvian", 36},     {"Ukrainian", 37}, {"Catalan", 38},
+  };
+  for (const auto &[name, id] : ids) EXPECT_EQ(get(0, name).id, id) << name;
+  const std::pair<const char *, uint16_t> territories[] = {
+      {"Lithuania", 440}, {"Estonia", 233}, {"Latvia", 428}, {"Ukraine", 804}, {"Spain", 724}};
+  for (const auto &[name, id] : territories) EXPECT_EQ(get(1, name).id, id) << name;
+  // Spain stays read from the Spanish row, not from the Catalan one listed before it.
+  EXPECT_EQ(text8(get(1, "Spain"), 20), "%d/%m/%y");
+}
+
 TEST_F(Generated, EnglishAndUnitedStates) {
   const DefObject &en = get(0, "English");
   EXPECT_EQ(word(en, 0), 840);
@@ -148,6 +170,9 @@ TEST_F(Generated, LanguageDefaultsAndTellingValues) {
       {"Japanese", 392, "JapanEUC", "ja"},  {"Korean", 410, "MS949", "ko"},
       {"TraditionalChinese", 158, "MS950", "zh"}, {"SerboCroatian", 891, "ISO-8859-2", "sh"},
       {"Russian", 643, "ISO-8859-5", "ru"}, {"Arabic", 682, "ISO-8859-6", "ar"},
+      {"Lithuanian", 440, "ISO-8859-13", "lt"}, {"Estonian", 233, "Latin1", "et"},
+      {"Latvian", 428, "ISO-8859-13", "lv"},    {"Ukrainian", 804, "KOI8-U", "uk"},
+      {"Catalan", 724, "Latin1", "ca"},
   };
   for (const Want &w : wants) {
     const DefObject &o = get(0, w.language);
@@ -201,7 +226,7 @@ TEST_F(Generated, BodiesAreWellFormed) {
 TEST_F(Generated, AgreesWithCompiledLocales) {
   fs::path dir = fs::temp_directory_path() / ("vl_locgen_" + std::to_string(getpid()));
   fs::create_directories(dir);
-  const char *sources[] = {"de_DE", "ja_JP", "zh_TW"};
+  const char *sources[] = {"de_DE", "ja_JP", "zh_TW", "lt_LT", "et_EE", "lv_LV", "uk_UA", "ca_ES", "es_ES"};
   for (const char *s : sources) {
     std::string cmd = "localedef -i " + std::string(s) + " -f UTF-8 " + (dir / (std::string(s) + ".UTF-8")).string() +
                       " >/dev/null 2>&1";
@@ -220,7 +245,8 @@ TEST_F(Generated, AgreesWithCompiledLocales) {
 
   auto info = [&](const std::string &s, nl_item item) { return fromUtf8(nl_langinfo_l(item, loc[s])); };
   const std::pair<const char *, const char *> languages[] = {
-      {"German", "de_DE"}, {"Japanese", "ja_JP"}, {"TraditionalChinese", "zh_TW"}};
+      {"German", "de_DE"},  {"Japanese", "ja_JP"}, {"TraditionalChinese", "zh_TW"}, {"Lithuanian", "lt_LT"},
+      {"Estonian", "et_EE"}, {"Latvian", "lv_LV"},  {"Ukrainian", "uk_UA"},           {"Catalan", "ca_ES"}};
   for (const auto &[name, s] : languages) {
     ASSERT_NE(loc[s], nullptr) << s;
     const DefObject &o = get(0, name);
@@ -236,8 +262,10 @@ TEST_F(Generated, AgreesWithCompiledLocales) {
     EXPECT_EQ(text(o, 48), info(s, PM_STR)) << name;
   }
   const std::pair<const char *, const char *> territories[] = {
-      {"Germany", "de_DE"}, {"Japan", "ja_JP"}, {"Taiwan", "zh_TW"}};
+      {"Germany", "de_DE"},  {"Japan", "ja_JP"},   {"Taiwan", "zh_TW"},  {"Lithuania", "lt_LT"},
+      {"Estonia", "et_EE"}, {"Latvia", "lv_LV"}, {"Ukraine", "uk_UA"}, {"Spain", "es_ES"}};
   for (const auto &[name, s] : territories) {
+    ASSERT_NE(loc[s], nullptr) << s;
     const DefObject &o = get(1, name);
     mkdefs::locsrc::TimeFormats tf{info(s, D_FMT), info(s, T_FMT), info(s, D_T_FMT), info(s, T_FMT_AMPM),
                                    info(s, _DATE_FMT)};
@@ -262,6 +290,7 @@ TEST(LocaleSource, ReaderFollowsTheFormat) {
                                 "LC_TIME\n"
                                 "abday \"a<U00E4>b\";\"x//y\" % trailing comment\n"
                                 "day \"Son/\nntag\";/\n    \"Mon\"\n"
+                                "mon \"Jan\"; % first /\n  \"Feb\" % last\n"
                                 "t_fmt \"%H:%M\"\n"
                                 "END LC_TIME\n"
                                 "LC_NUMERIC\ncopy \"base\"\nEND LC_NUMERIC\n"
@@ -280,7 +309,8 @@ TEST(LocaleSource, ReaderFollowsTheFormat) {
   EXPECT_EQ(strings("LC_TIME", "t_fmt"), (std::vector<std::string>{"%H:%M"}));
   EXPECT_EQ(strings("LC_NUMERIC", "decimal_point"), (std::vector<std::string>{","}));
   EXPECT_EQ(strings("LC_NUMERIC", "grouping"), (std::vector<std::string>{"3", "-1"}));
-  EXPECT_TRUE(strings("LC_TIME", "mon").empty());
+  EXPECT_EQ(strings("LC_TIME", "mon"), (std::vector<std::string>{"Jan", "Feb"}));
+  EXPECT_TRUE(strings("LC_TIME", "abmon").empty());
   EXPECT_EQ(err, "");
   EXPECT_TRUE(strings("LC_MONETARY", "frac_digits").empty());
   EXPECT_NE(err, "");
@@ -405,4 +435,7 @@ TEST_F(Generated, SpecialCasingFollowsTheFile) {
   EXPECT_EQ(lower("Turkish")[u"I"], u"\u0131");
   EXPECT_EQ(lower("Turkish").count(u"\u0130"), 0u);  // left to the simple mapping
   EXPECT_EQ(upper("English").count(u"i"), 0u);
+  EXPECT_EQ(upper("Lithuanian")[u"i\u0307"], u"I");
+  EXPECT_EQ(upper("English").count(u"i\u0307"), 0u);
+  EXPECT_EQ(word(get(0, "Lithuanian"), 51), 1);
 }

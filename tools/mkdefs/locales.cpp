@@ -1,12 +1,14 @@
 // Language and territory objects for every language and territory of the native locale
 // table, filled from the C library's locale sources.
 //
-// Numbering: English is language 1, the other languages follow from 2 in ascending
-// (byte-wise) order of their names; territories carry their ISO 3166 numeric code.
+// Numbering: English is language 1, the languages of the first table follow from 2 in
+// ascending (byte-wise) order of their names, and languages added since take the next
+// numbers in the order they were added; territories carry their ISO 3166 numeric code.
 // A language is read from its primary row: the first row whose territory code repeats
 // the language code ("de_DE" rather than "de_AT"), else its first row in a territory
 // whose own first row is of that language ("sv_SE" rather than "sv_FI"), else its first
-// row. A territory is read from the first row that names it.
+// row. A territory is read from the first row that names it, rows of the languages added
+// later counting only when no other row names it.
 #include "locales.h"
 
 #include <algorithm>
@@ -47,6 +49,16 @@ const std::map<std::string, Identity> kIdentity = {
     {"SerboCroatian", {"sh", U"Serbo-Croatian", 0}},
     {"Yugoslavia", {"YU", U"Yugoslavia", 891}},
 };
+
+// Languages added after the first numbering, oldest first. Ids once given never move, so
+// a new language goes at the end of this list, never into the alphabetical run.
+const char *const kLaterLanguages[] = {"Lithuanian", "Estonian", "Latvian", "Ukrainian", "Catalan"};
+
+size_t addedRank(const std::string &language) {
+  for (size_t i = 0; i < std::size(kLaterLanguages); ++i)
+    if (language == kLaterLanguages[i]) return i + 1;
+  return 0;
+}
 
 const size_t kLanguageWords = 52;   // 0-48, the two special-case table offsets, the special-casing flag
 const size_t kTerritoryWords = 22;
@@ -392,8 +404,13 @@ bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
   for (const NativeRow &r : kRows) {
     if (rowsOf[r.language].empty()) languages.push_back(r.language);
     rowsOf[r.language].push_back(&r);
-    if (territoryRow.emplace(r.territory, &r).second) territories.push_back(r.territory);
   }
+  // Rows of the languages added later name a territory only when no older row does, so
+  // adding "ca_ES" leaves Spain read from "es_ES".
+  for (bool later : {false, true})
+    for (const NativeRow &r : kRows)
+      if ((addedRank(r.language) != 0) == later && territoryRow.emplace(r.territory, &r).second)
+        territories.push_back(r.territory);
 
   std::vector<DefObject> territoryObjs;
   std::map<std::string, uint16_t> territoryIds;
@@ -412,6 +429,7 @@ bool buildLanguagesAndTerritories(const std::string &localeSrcDir,
             [](const DefObject &a, const DefObject &b) { return a.id < b.id; });
 
   std::sort(languages.begin(), languages.end(), [](const std::string &a, const std::string &b) {
+    if (addedRank(a) != addedRank(b)) return addedRank(a) < addedRank(b);
     return (a == "English") != (b == "English") ? a == "English" : a < b;
   });
   std::vector<DefObject> objs;

@@ -83,7 +83,13 @@ class Reader {
       } else if (c == esc_ && atLineEnd(i + 1)) {
         i = skipNewline(i + 1);  // continuation
       } else if (c == com_) {
-        while (i < n && t[i] != '\n') ++i;
+        // A comment ending in the escape character still continues the line, as the C
+        // library reads "day "x"; % note /" lists.
+        size_t end = i;
+        while (end < n && t[end] != '\n') ++end;
+        size_t last = end;
+        while (last > i && (t[last - 1] == '\r' || t[last - 1] == ' ' || t[last - 1] == '\t')) --last;
+        i = last > i + 1 && t[last - 1] == esc_ && end < n ? end + 1 : end;
       } else if (c == ';') {
         line.push_back({Tok::Semi, {}});
         ++i;

@@ -27,7 +27,7 @@ const SortSpec kSorts[] = {
     {7, "Icelandic", "is_IS"},     {8, "Norwegian", "nb_NO"},  {9, "Polish", "pl_PL"},
     {10, "Slovak", "sk_SK"},       {11, "Slovenian", "sl_SI"}, {12, "Spanish", "es_ES"},
     {13, "Swedish", "sv_SE"},      {14, "Turkish", "tr_TR"},   {15, "Estonian", "et_EE"},
-    {16, "Lithuanian", "lt_LT"},
+    {16, "Lithuanian", "lt_LT"},   {17, "Latvian", "lv_LV"},   {18, "Ukrainian", "uk_UA"},
 };
 
 struct NativeRow {
