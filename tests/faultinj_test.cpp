@@ -3,13 +3,16 @@
 // block is left once the library ends.
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <cstring>
+#include <fstream>
 #include <functional>
 #include <string>
 #include <vector>
 
 #include "frame/frame.h"
 #include "nls1.h"
+#include "veltrin.h"
 #include "support/hooks.h"
 
 namespace {
@@ -19,6 +22,8 @@ struct Ctx {
   VLLocale *other = nullptr;  // Japanese_Japan.IBM930
   VLObjEntry *entry = nullptr;
   VLConversion *conv = nullptr;
+  VLCatalog *cat = nullptr;
+  std::string path;
 };
 
 VLObjEntry *object(uint16_t type, const char *name) {
@@ -38,6 +43,20 @@ bool usable(VLLocale *l) {
   VLUChar u[64];
   return VLGetLocaleTextInfo(l, VL_ITEM_LOCALE, buf, sizeof buf, 0) > 0 &&
          VLGetLocaleTextInfoU(l, VL_ITEM_LOCALE, u, 64, 0) > 0 && VLStringToUnicode(u, 64, l, "abc", 3, 0) == 3;
+}
+
+// A catalog compiled once by the tool, in a directory of its own.
+const std::string &catalogDir() {
+  static const std::string dir = [] {
+    char tmpl[] = "/tmp/vlfault.XXXXXX";
+    std::string d = mkdtemp(tmpl) ? tmpl : "/tmp";
+    std::ofstream(d + "/fault.msg") << "$set 1\n1 eins\n2 zwei\n$set 2\n7 sieben\n";
+    std::string cmd = std::string(VL_TEST_TLX) + " gencat --dir " + VL_TEST_DEFS_DIR +
+                      " --locale German_Germany.MS1252 " + d + "/fault.cat " + d + "/fault.msg";
+    EXPECT_EQ(std::system(cmd.c_str()), 0);
+    return d;
+  }();
+  return dir;
 }
 
 struct Row {
@@ -110,6 +129,36 @@ const Row kRows[] = {
        return c.conv ? 0u : uint32_t(VLGetError(c.other));
      },
      bothUsable},
+    // Families built on a handle: what they allocate is a work area, and a failure must
+    // leave both the handle and the caller's strings as they were.
+    {"VLStrcmp without regard to case, on the mapped path", loadBoth,
+     [](Ctx &c) {
+       int32_t r = VLStrcmp(c.l, "Stra\xDF" "e", -1, "STRASSE", -1, VL_CMP_NOCASE);
+       return r == 0 ? uint32_t(VLGetError(c.l)) : 99u;
+     },
+     bothUsable},
+    {"VLStrcoll beyond the stack work area",
+     [](Ctx &c) {
+       uint32_t rc = 0;
+       c.l = VLGetLocale("German_Germany.MS1252@Swedish", 0, &rc);
+       c.other = locale("Japanese_Japan.IBM930");
+     },
+     [](Ctx &c) {
+       std::string a(3000, 'a'), b = a + "\xE4";
+       VLStrcoll(c.l, a.c_str(), -1, b.c_str(), -1, 0);
+       return uint32_t(VLGetError(c.l));
+     },
+     bothUsable},
+    {"VLOpenCatalog in memory",
+     [](Ctx &c) {
+       loadBoth(c);
+       c.path = catalogDir();
+     },
+     [](Ctx &c) {
+       c.cat = VLOpenCatalog(c.l, (c.path + "/%N").c_str(), "fault.cat", 0x80000061u);
+       return c.cat ? 0u : uint32_t(VLGetError(c.l));
+     },
+     bothUsable},
     {"VLSetLocale", [](Ctx &) { VLSetLocale("German_Germany.MS1252", 0); },
      [](Ctx &) { return VLSetLocale("French_France.Latin1", 0); },
      [](Ctx &) { return usable(vlglocale); }},
@@ -133,6 +182,7 @@ uint32_t oneLife(const Row &row, long failAt, long *callAllocs, bool *usableAfte
   ts::hooks.failAt = -1;
   *usableAfter = row.stillUsable(c);
   if (c.conv) VLCloseConversion(c.conv);
+  if (c.cat) VLCloseCatalog(c.cat);
   if (c.l) VLReleaseLocale(c.l);
   if (c.other) VLReleaseLocale(c.other);
   VLTerm();

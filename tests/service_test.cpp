@@ -414,7 +414,7 @@ void FirstUse() {
     }
     return all;
   };
-  constexpr size_t kThreads = 8;
+  constexpr size_t kThreads = 16;
   std::atomic<size_t> waiting{kThreads};
   std::vector<Result> got(kThreads);
   std::vector<std::string> seen(kThreads);

@@ -334,7 +334,7 @@ std::vector<FirstUse> firstUses() {
 
 TEST(StoreThreads, FirstUseOfEachObjectKindAgreesWithOneThread) {
   if (!haveDefs()) GTEST_SKIP() << "no generated definitions";
-  constexpr int kThreads = 8;
+  constexpr int kThreads = 16;
   for (const FirstUse &row : firstUses()) {
     SCOPED_TRACE(row.kind);
     std::vector<std::string> want;
