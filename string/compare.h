@@ -62,27 +62,6 @@ inline size_t mappedBytes(uint32_t n, uint32_t per) {
   return b > 0x7fffffffu ? 0x7fffffffu : static_cast<size_t>(b);
 }
 
-// The language's upper-case special keys, filtered by first unit. Building the filter
-// walks the whole table, so each thread keeps the last one and rebuilds it when the
-// language, its body or the unload count changes.
-inline const map::Special &upperKeys(const VLLocale *l) {
-  struct Cache {
-    const VLObjEntry *lang = nullptr;
-    const void *body = nullptr;
-    uint32_t unloads = 0;
-    map::Special sp{nullptr, 44};
-  };
-  static thread_local Cache c;
-  const VLObjEntry *lang = l->language;
-  const uint32_t gen = store::unloads.load(std::memory_order_acquire);
-  const void *b = lang ? __atomic_load_n(&lang->section[0], __ATOMIC_ACQUIRE) : nullptr;
-  if (c.lang != lang || c.body != b || c.unloads != gen) {
-    c.sp = map::Special(lang, 44);
-    c.lang = lang, c.body = b, c.unloads = gen;
-  }
-  return c.sp;
-}
-
 // True when u is the first unit of an upper-case special key (single or pair).
 inline bool startsKey(const map::Special &sp, VLUChar u) {
   if (!sp.active || !sp.maybe(u)) return false;
@@ -94,22 +73,59 @@ inline bool startsKey(const map::Special &sp, VLUChar u) {
   return false;
 }
 
+// The language's upper-case special keys, filtered by first unit, and the one-byte values
+// of the code page that start one.
+struct Keys {
+  map::Special sp{nullptr, 44};
+  uint64_t bytes[4] = {};
+  bool byte(uint32_t v) const { return ((bytes[v >> 6] >> (v & 63)) & 1) != 0; }
+};
+
+// Building the filter walks the whole table, so each thread keeps the last one and
+// rebuilds it when the language, its body, the code page or the unload count changes.
+inline const Keys &upperKeys(const VLLocale *l) {
+  struct Cache {
+    const VLObjEntry *lang = nullptr, *page = nullptr;
+    const void *body = nullptr;
+    uint32_t unloads = 0;
+    Keys k;
+  };
+  static thread_local Cache c;
+  const VLObjEntry *lang = l->language;
+  const uint32_t gen = store::unloads.load(std::memory_order_acquire);
+  const void *b = lang ? __atomic_load_n(&lang->section[0], __ATOMIC_ACQUIRE) : nullptr;
+  if (c.lang != lang || c.page != l->codePage || c.body != b || c.unloads != gen) {
+    c.k.sp = map::Special(lang, 44);
+    for (uint64_t &w : c.k.bytes) w = 0;
+    for (uint32_t v = 0; v < 256; ++v)
+      if (startsKey(c.k.sp, cp::sbcsUni(l->codePage, static_cast<uint8_t>(v))))
+        c.k.bytes[v >> 6] |= uint64_t{1} << (v & 63);
+    c.lang = lang, c.page = l->codePage, c.body = b, c.unloads = gen;
+  }
+  return c.k;
+}
+
 // Whether special casing can change anything in s: without a key start, upper-casing it
 // with and without the special table gives the same text.
-template <class T, class Uni>
-bool unitsNeedSpecial(const map::Special &sp, const T *s, uint32_t n, Uni uni) {
+template <class T, class IsKey>
+bool unitsNeedSpecial(const Keys &keys, const T *s, uint32_t n, IsKey isKey) {
   for (uint32_t i = 0; i < n; ++i)
-    if (startsKey(sp, uni(s[i]))) return true;
+    if (isKey(keys, s[i])) return true;
   return false;
 }
 template <class F>
-bool bytesNeedSpecial(const map::Special &sp, const VLCodePage *c, F f, const uint8_t *s, uint32_t n) {
-  if (!sp.active) return false;
+bool bytesNeedSpecial(const Keys &keys, const VLCodePage *c, F f, const uint8_t *s, uint32_t n) {
+  if (!keys.sp.active) return false;
+  if (!F::kShift && f.singleByte()) {
+    for (uint32_t i = 0; i < n; ++i)
+      if (keys.byte(s[i])) return true;
+    return false;
+  }
   const map::CpPage page{c};
   Walk<F> w{f, s, n};
   uint32_t at, k;
   while (w.next(at, k))
-    if (startsKey(sp, page.toUni(cp::readW(s + at, k)))) return true;
+    if (k == 1 ? keys.byte(s[at]) : startsKey(keys.sp, page.toUni(cp::readW(s + at, k)))) return true;
   return false;
 }
 
@@ -308,9 +324,9 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
       break;
     case Mode::Case:
       if (specialCasing(l)) {
-        const map::Special &sp = upperKeys(l);
+        const Keys &keys = upperKeys(l);
         const bool special =
-            bytesNeedSpecial(sp, l->codePage, f1, s1, n1) || bytesNeedSpecial(sp, l->codePage, f2, s2, n2);
+            bytesNeedSpecial(keys, l->codePage, f1, s1, n1) || bytesNeedSpecial(keys, l->codePage, f2, s2, n2);
         // A single-byte page folds through its table below, exactly as the mapping would.
         if (special || F::kShift || !f1.singleByte()) {
           auto byteMap = [&](uint8_t *out, int32_t cap, const uint8_t *s, uint32_t k, int which, uint32_t sel) {
@@ -334,11 +350,11 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
 }
 
 // W values and UTF-16 units. fold is applied to each unit when not comparing exactly;
-// with special casing, strings holding a key start (uni gives a unit's UTF-16) go
-// through map instead, and fold must then upper-case as map does without the table.
-template <class T, class Fold, class Map, class Uni>
+// with special casing, strings holding a key start (isKey(keys, unit)) go through map
+// instead, and fold must then upper-case as map does without the table.
+template <class T, class Fold, class Map, class IsKey>
 int32_t compareUnits(VLLocale *l, const T *s1, int32_t len1, const T *s2, int32_t len2, bool blanks, T blank,
-                     bool exact, bool mapped, bool signOnly, Fold fold, Map map, Uni uni) {
+                     bool exact, bool mapped, bool signOnly, Fold fold, Map map, IsKey isKey) {
   uint32_t n1 = s1 ? resolveLen(s1, len1) : 0, n2 = s2 ? resolveLen(s2, len2) : 0;
   if (blanks) {
     while (n1 && s1[n1 - 1] == blank) --n1;
@@ -346,8 +362,8 @@ int32_t compareUnits(VLLocale *l, const T *s1, int32_t len1, const T *s2, int32_
   }
   if (!n1 || !n2) return diff(n1, n2);
   if (!exact && mapped) {
-    const map::Special &sp = upperKeys(l);
-    if (unitsNeedSpecial(sp, s1, n1, uni) || unitsNeedSpecial(sp, s2, n2, uni))
+    const Keys &keys = upperKeys(l);
+    if (unitsNeedSpecial(keys, s1, n1, isKey) || unitsNeedSpecial(keys, s2, n2, isKey))
       return compareMapped<T>(l, s1, n1, s2, n2, 2 * sizeof(T), true, true, map);  // a unit may become two
   }
   const uint32_t n = std::min(n1, n2);

@@ -19,5 +19,5 @@ int32_t VLStrcmpU(VLLocale *locale, const VLUChar *str1, int32_t len1, const VLU
   };
   VL_RET(compareUnits<VLUChar>(l, str1, len1, str2, len2, (options & kCmpBlanks) != 0, VLUChar{0x20},
                                mode == Mode::Exact, mode == Mode::Case && specialCasing(l), true, fold, map,
-                               [](VLUChar u) { return u; }));
+                               [](const Keys &k, VLUChar u) { return startsKey(k.sp, u); }));
 }
