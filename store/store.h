@@ -1,5 +1,6 @@
 // The object manager's records and the container format as read from disk.
 #pragma once
+#include <atomic>
 #include <cstdint>
 
 #include "frame/frame.h"
@@ -19,6 +20,9 @@ struct VLObjManager {
 };
 
 namespace vl::store {
+
+// Bumped by every unload: caches derived from a body drop it when this moves.
+inline std::atomic<uint32_t> unloads{0};
 
 constexpr uint32_t kMagic = 0x476CF462;
 constexpr uint32_t kHeaderSize = 76;

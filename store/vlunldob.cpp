@@ -6,6 +6,7 @@ VL_TRACE_MODULE("vlunldob");
 uint32_t VLUnloadObj(VLObjManager *, VLObjEntry *e) {
   VL_FLOW("VLUnloadObj");
   if (!e) VL_RET(uint32_t{0});
+  vl::store::unloads.fetch_add(1, std::memory_order_release);
   uint32_t rc = 0;
   if (!(e->flags & 0x01)) {
     for (int i = 3; i >= 0; --i) {

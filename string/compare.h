@@ -8,8 +8,10 @@
 #include <tuple>
 
 #include "codepage/cpprim.h"
+#include "codepage/mapfam.h"
 #include "codepage/step.h"
 #include "codepage/unimap.h"
+#include "store/store.h"
 #include "string/trunc.h"
 
 namespace vl::str {
@@ -60,26 +62,100 @@ inline size_t mappedBytes(uint32_t n, uint32_t per) {
   return b > 0x7fffffffu ? 0x7fffffffu : static_cast<size_t>(b);
 }
 
-// Both strings upper-cased with the language's special casing into hook blocks of `per`
-// bytes a unit, then compared as bytes. map(out, capacityUnits, s, n, which) gives units.
+// True when u is the first unit of an upper-case special key (single or pair).
+inline bool startsKey(const map::Special &sp, VLUChar u) {
+  if (!sp.active || !sp.maybe(u)) return false;
+  const auto *b = static_cast<const uint8_t *>(__atomic_load_n(&sp.lang->section[0], __ATOMIC_ACQUIRE));
+  const uint16_t count = rd16(b + 6);
+  const uint8_t *e = b + rd16(b + 2 * 49);
+  for (uint16_t i = 0; i < count; ++i, e += 8)
+    if (rd16(e) == u) return true;
+  return false;
+}
+
+// The language's upper-case special keys, filtered by first unit, and the one-byte values
+// of the code page that start one.
+struct Keys {
+  map::Special sp{nullptr, 44};
+  uint64_t bytes[4] = {};
+  bool byte(uint32_t v) const { return ((bytes[v >> 6] >> (v & 63)) & 1) != 0; }
+};
+
+// Building the filter walks the whole table, so each thread keeps the last one and
+// rebuilds it when the language, its body, the code page or the unload count changes.
+inline const Keys &upperKeys(const VLLocale *l) {
+  struct Cache {
+    const VLObjEntry *lang = nullptr, *page = nullptr;
+    const void *body = nullptr;
+    uint32_t unloads = 0;
+    Keys k;
+  };
+  static thread_local Cache c;
+  const VLObjEntry *lang = l->language;
+  const uint32_t gen = store::unloads.load(std::memory_order_acquire);
+  const void *b = lang ? __atomic_load_n(&lang->section[0], __ATOMIC_ACQUIRE) : nullptr;
+  if (c.lang != lang || c.page != l->codePage || c.body != b || c.unloads != gen) {
+    c.k.sp = map::Special(lang, 44);
+    for (uint64_t &w : c.k.bytes) w = 0;
+    for (uint32_t v = 0; v < 256; ++v)
+      if (startsKey(c.k.sp, cp::sbcsUni(l->codePage, static_cast<uint8_t>(v))))
+        c.k.bytes[v >> 6] |= uint64_t{1} << (v & 63);
+    c.lang = lang, c.page = l->codePage, c.body = b, c.unloads = gen;
+  }
+  return c.k;
+}
+
+// Whether special casing can change anything in s: without a key start, upper-casing it
+// with and without the special table gives the same text.
+template <class T, class IsKey>
+bool unitsNeedSpecial(const Keys &keys, const T *s, uint32_t n, IsKey isKey) {
+  for (uint32_t i = 0; i < n; ++i)
+    if (isKey(keys, s[i])) return true;
+  return false;
+}
+template <class F>
+bool bytesNeedSpecial(const Keys &keys, const VLCodePage *c, F f, const uint8_t *s, uint32_t n) {
+  if (!keys.sp.active) return false;
+  if (!F::kShift && f.singleByte()) {
+    for (uint32_t i = 0; i < n; ++i)
+      if (keys.byte(s[i])) return true;
+    return false;
+  }
+  const map::CpPage page{c};
+  Walk<F> w{f, s, n};
+  uint32_t at, k;
+  while (w.next(at, k))
+    if (k == 1 ? keys.byte(s[at]) : startsKey(keys.sp, page.toUni(cp::readW(s + at, k)))) return true;
+  return false;
+}
+
+// Both strings upper-cased into blocks of `per` bytes a unit, then compared as bytes.
+// map(out, capacityUnits, s, n, which, selector) gives units. Special casing always
+// takes hook blocks; the plain upper case of short strings maps on the stack.
 template <class T, class Map>
 int32_t compareMapped(VLLocale *l, const T *s1, uint32_t n1, const T *s2, uint32_t n2, uint32_t per, bool swap,
-                      Map map) {
+                      bool special, Map map) {
+  constexpr size_t kLocal = 1024;
   const size_t b1 = mappedBytes(n1, per), b2 = mappedBytes(n2, per);
-  Block<T> m1(b1), m2(b2);
-  if (!m1 || !m2) {
+  alignas(8) uint8_t local[2][kLocal];
+  const bool onStack = !special && b1 <= kLocal && b2 <= kLocal;
+  Block<T> m1(onStack ? 0 : b1), m2(onStack ? 0 : b2);
+  T *o1 = onStack ? reinterpret_cast<T *>(local[0]) : m1.get();
+  T *o2 = onStack ? reinterpret_cast<T *>(local[1]) : m2.get();
+  if (!o1 || !o2) {
     setRc(l, VL_RC_NOMEM);
     return 0;
   }
-  int32_t k1 = map(m1.get(), static_cast<int32_t>(b1 / sizeof(T)), s1, n1, 0);
-  int32_t k2 = map(m2.get(), static_cast<int32_t>(b2 / sizeof(T)), s2, n2, 1);
+  const uint32_t sel = special ? kMapUpperSel : kMapUpperSel | VL_MAP_NOSPECIAL;
+  int32_t k1 = map(o1, static_cast<int32_t>(b1 / sizeof(T)), s1, n1, 0, sel);
+  int32_t k2 = map(o2, static_cast<int32_t>(b2 / sizeof(T)), s2, n2, 1, sel);
   k1 = std::max(k1, 0);
   k2 = std::max(k2, 0);
   if (swap) {
-    VLStrBigEndian(m1.get(), k1 * static_cast<int32_t>(sizeof(T)));
-    VLStrBigEndian(m2.get(), k2 * static_cast<int32_t>(sizeof(T)));
+    VLStrBigEndian(o1, k1 * static_cast<int32_t>(sizeof(T)));
+    VLStrBigEndian(o2, k2 * static_cast<int32_t>(sizeof(T)));
   }
-  int r = std::memcmp(m1.get(), m2.get(), sizeof(T) * static_cast<uint32_t>(std::min(k1, k2)));
+  int r = std::memcmp(o1, o2, sizeof(T) * static_cast<uint32_t>(std::min(k1, k2)));
   return r ? r : k1 - k2;
 }
 
@@ -248,10 +324,16 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
       break;
     case Mode::Case:
       if (specialCasing(l)) {
-        auto byteMap = [&](uint8_t *out, int32_t cap, const uint8_t *s, uint32_t k, int which) {
-          return map(cb(out), cap, cb(s), static_cast<int32_t>(k), which ? f2.state : f1.state);
-        };
-        return compareMapped<uint8_t>(l, s1, n1, s2, n2, 8, false, byteMap);
+        const Keys &keys = upperKeys(l);
+        const bool special =
+            bytesNeedSpecial(keys, l->codePage, f1, s1, n1) || bytesNeedSpecial(keys, l->codePage, f2, s2, n2);
+        // A single-byte page folds through its table below, exactly as the mapping would.
+        if (special || F::kShift || !f1.singleByte()) {
+          auto byteMap = [&](uint8_t *out, int32_t cap, const uint8_t *s, uint32_t k, int which, uint32_t sel) {
+            return map(cb(out), cap, cb(s), static_cast<int32_t>(k), which ? f2.state : f1.state, sel);
+          };
+          return compareMapped<uint8_t>(l, s1, n1, s2, n2, 8, false, special, byteMap);
+        }
       }
       r = compareCase(l, f1, s1, f2, s2, n);
       break;
@@ -268,17 +350,22 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
 }
 
 // W values and UTF-16 units. fold is applied to each unit when not comparing exactly;
-// Units<T> of a locale with special casing go through map instead.
-template <class T, class Fold, class Map>
+// with special casing, strings holding a key start (isKey(keys, unit)) go through map
+// instead, and fold must then upper-case as map does without the table.
+template <class T, class Fold, class Map, class IsKey>
 int32_t compareUnits(VLLocale *l, const T *s1, int32_t len1, const T *s2, int32_t len2, bool blanks, T blank,
-                     bool exact, bool mapped, bool signOnly, Fold fold, Map map) {
+                     bool exact, bool mapped, bool signOnly, Fold fold, Map map, IsKey isKey) {
   uint32_t n1 = s1 ? resolveLen(s1, len1) : 0, n2 = s2 ? resolveLen(s2, len2) : 0;
   if (blanks) {
     while (n1 && s1[n1 - 1] == blank) --n1;
     while (n2 && s2[n2 - 1] == blank) --n2;
   }
   if (!n1 || !n2) return diff(n1, n2);
-  if (!exact && mapped) return compareMapped<T>(l, s1, n1, s2, n2, 4, true, map);
+  if (!exact && mapped) {
+    const Keys &keys = upperKeys(l);
+    if (unitsNeedSpecial(keys, s1, n1, isKey) || unitsNeedSpecial(keys, s2, n2, isKey))
+      return compareMapped<T>(l, s1, n1, s2, n2, 2 * sizeof(T), true, true, map);  // a unit may become two
+  }
   const uint32_t n = std::min(n1, n2);
   for (uint32_t i = 0; i < n; ++i) {
     uint32_t a = s1[i], b = s2[i];

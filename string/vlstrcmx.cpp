@@ -12,8 +12,8 @@ int32_t VLStrcmpEx(VLLocale *locale, const char *str1, VLShiftState state1, int3
   if (!isShifted(l)) VL_RET(VLStrcmp(l, str1, len1, str2, len2, options));
   VL_TRACE(TRC1_DETAIL, "Options = %08x", options);
   if (!cmpLocale(l, (options & kCmpRejected) != 0)) VL_RET(int32_t{0});
-  auto map = [l](char *out, int32_t cap, const char *in, int32_t n, uint32_t state) {
-    return VLMapStringEx(l, out, cap, in, state, n, kMapUpperSel);
+  auto map = [l](char *out, int32_t cap, const char *in, int32_t n, uint32_t state, uint32_t sel) {
+    return VLMapStringEx(l, out, cap, in, state, n, sel);
   };
   VL_RET(compareBytes(l, shiftedOf(l, state1), ub(str1), len1, shiftedOf(l, state2), ub(str2), len2, options,
                       vl_trc, map));

@@ -130,18 +130,19 @@ TEST_F(Compare, RefusedOptionsGiveZeroWithCode2) {
   EXPECT_EQ(VLGetError(sb_), 0);
 }
 
-// The special-cased comparison allocates two blocks; either failing gives code 20 and
-// leaves nothing behind.
+// The special-cased comparison allocates two blocks (as does the mapping of strings too
+// long for the stack); either failing gives code 20 and leaves nothing behind.
 TEST_F(Compare, AllocationFailureOnTheMappedPath) {
   const VLUChar u1[] = {'s', 0xDF, 0}, u2[] = {'S', 'S', 'S', 0};
-  const VLWChar w1[] = {'a', 0}, w2[] = {'A', 0};
+  const VLWChar w1[] = {'a', 0xDF, 0}, w2[] = {'A', 'S', 'S', 0};
+  const std::string long1(300, '\x62'), long2(300, '\xC1');
   struct {
     const char *what;
     std::function<int32_t()> call;
     VLLocale *Compare::*loc;
   } calls[] = {
       {"plain", [&] { return VLStrcmp(de_, "stra\xDF" "e", -1, "STRASSE", -1, kCase); }, &Compare::de_},
-      {"Ex", [&] { return VLStrcmpEx(sh_, "\x62", 0, -1, "\xC1", 0, -1, kCase); }, &Compare::sh_},
+      {"Ex", [&] { return VLStrcmpEx(sh_, long1.c_str(), 0, -1, long2.c_str(), 0, -1, kCase); }, &Compare::sh_},
       {"W", [&] { return VLWcscmp(de_, w1, -1, w2, -1, kCase); }, &Compare::de_},
       {"U", [&] { return VLStrcmpU(de_, u1, -1, u2, -1, kCase); }, &Compare::de_},
   };
