@@ -49,8 +49,8 @@ inline unsigned plainOut(const VLCodePage *c) {
 }
 
 // A run of plain values, many at a time.
-inline size_t plainCopy(const uint8_t *s, VLUChar *d, size_t n, unsigned lim) { return simd::widen(s, d, n, lim); }
-inline size_t plainCopy(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) { return simd::narrow(s, d, n, lim); }
+inline size_t plainCopy(const uint8_t *s, VLUChar *d, size_t n, unsigned lim) { return simd::widenRun(s, d, n, lim); }
+inline size_t plainCopy(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) { return simd::narrowRun(s, d, n, lim); }
 inline size_t plainCopy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) { return simd::copy(s, d, n, lim); }
 
 // ---- Decoders: the bytes of one character to a value ---------------------------------

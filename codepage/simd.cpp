@@ -23,7 +23,6 @@ int detect() {
 }
 
 const int g_detected = detect();
-std::atomic<int> g_level{g_detected};
 
 // ---- Scalar: the reference every vector path must match ----------------------------
 
@@ -142,9 +141,9 @@ size_t copySse2(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) {
 
 }  // namespace
 
-int level() { return g_level.load(std::memory_order_relaxed); }
+std::atomic<int> levelNow{g_detected};
 
-void capLevel(int cap) { g_level.store(cap < 0 || cap > g_detected ? g_detected : cap, std::memory_order_relaxed); }
+void capLevel(int cap) { levelNow.store(cap < 0 || cap > g_detected ? g_detected : cap, std::memory_order_relaxed); }
 
 namespace {
 

@@ -57,19 +57,26 @@ TEST(Simd, EveryLevelCopiesTheSameRuns) {
         // Units past 0xFF end a run of either kind.
         if (!atEnd) units[len] = static_cast<VLUChar>(0x100 + rng() % 0xFF00);
         struct Out {
-          size_t wide, narrow, copy, wideAll;
+          size_t wide, narrow, copy, wideAll, wideRun, narrowRun;
           std::vector<VLUChar> w, wAll;
           std::vector<uint8_t> nb, cb;
         };
         std::vector<Out> outs;
         for (int l : levels()) {
           simd::capLevel(l);
-          Out o{0, 0, 0, 0, std::vector<VLUChar>(n + 1, 0xAAAA), std::vector<VLUChar>(n + 1, 0xAAAA),
+          Out o{0, 0, 0, 0, 0, 0, std::vector<VLUChar>(n + 1, 0xAAAA), std::vector<VLUChar>(n + 1, 0xAAAA),
                 std::vector<uint8_t>(n + 1, 0xAA), std::vector<uint8_t>(n + 1, 0xAA)};
+          // The in-line first block: same runs and bytes as the calls.
+          std::vector<VLUChar> wr(n + 1, 0xAAAA);
+          std::vector<uint8_t> nr(n + 1, 0xAA);
+          o.wideRun = simd::widenRun(s, wr.data(), n, 0x80);
+          o.narrowRun = simd::narrowRun(units.data(), nr.data(), n, 0x80);
           o.wide = simd::widen(s, o.w.data(), n, 0x80);
           o.wideAll = simd::widen(s, o.wAll.data(), n, 0x100);
           o.narrow = simd::narrow(units.data(), o.nb.data(), n, 0x80);
           o.copy = simd::copy(s, o.cb.data(), n, 0x80);
+          EXPECT_EQ(wr, o.w);
+          EXPECT_EQ(nr, o.nb);
           outs.push_back(std::move(o));
         }
         const Out &ref = outs[0];
@@ -83,6 +90,8 @@ TEST(Simd, EveryLevelCopiesTheSameRuns) {
           EXPECT_EQ(o.wideAll, ref.wideAll) << at;
           EXPECT_EQ(o.narrow, ref.narrow) << at;
           EXPECT_EQ(o.copy, ref.copy) << at;
+          EXPECT_EQ(o.wideRun, ref.wide) << at;
+          EXPECT_EQ(o.narrowRun, ref.narrow) << at;
           // Whole buffers: nothing may be written past the run.
           EXPECT_EQ(o.w, ref.w) << at;
           EXPECT_EQ(o.wAll, ref.wAll) << at;
