@@ -506,9 +506,19 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
             i += k;
             // The run ended at a value that is not plain: convert one by one until a plain
             // value starts the next run (peeking only while another character is safe).
-            size_t m = n - i, j = 0;
+            // After a run shorter than a block, a stretch goes one by one first: a table
+            // load per character costs less than starting runs that end at once.
+            size_t m = n - i, j = 0, least = k < 16 ? std::min<size_t>(m, 24) : 0;
             bool refused = false;
-            while (j < m) {
+            for (; j < least && !refused; ++j) {
+              Value v;
+              if (!lr.fast(v)) {
+                refused = true;
+                break;
+              }
+              lw.fast(v);
+            }
+            while (!refused && j < m) {
               Value v;
               if (!lr.fast(v)) {
                 refused = true;
