@@ -13,10 +13,7 @@
 #include <cstring>
 
 #include "codepage/cpprim.h"
-
-#ifdef __SSE2__
-#include <emmintrin.h>
-#endif
+#include "codepage/simd.h"
 
 namespace vl::cnv {
 
@@ -51,47 +48,10 @@ inline unsigned plainOut(const VLCodePage *c) {
   return l >= 0x100 ? 0x100 : l >= 0x80 ? 0x80 : 0;
 }
 
-// Copies whole blocks of 16 plain values while they last; returns how many. A block that
-// is not all plain is left to the per-character loop, which costs no more than a scalar
-// scan for its end would.
-inline size_t plainCopy(const uint8_t *s, VLUChar *d, size_t n, unsigned lim) {
-  size_t i = 0;
-#ifdef __SSE2__
-  const __m128i z = _mm_setzero_si128();
-  for (; i + 16 <= n; i += 16) {
-    __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
-    if (lim < 0x100 && _mm_movemask_epi8(x)) break;
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i), _mm_unpacklo_epi8(x, z));
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i + 8), _mm_unpackhi_epi8(x, z));
-  }
-#endif
-  return i;
-}
-inline size_t plainCopy(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) {
-  size_t i = 0;
-#ifdef __SSE2__
-  const __m128i z = _mm_setzero_si128(), high = _mm_set1_epi16(static_cast<short>(lim < 0x100 ? 0xFF80 : 0xFF00));
-  for (; i + 16 <= n; i += 16) {
-    __m128i a = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
-    __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i + 8));
-    __m128i t = _mm_and_si128(_mm_or_si128(a, b), high);
-    if (_mm_movemask_epi8(_mm_cmpeq_epi16(t, z)) != 0xFFFF) break;
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i), _mm_packus_epi16(a, b));
-  }
-#endif
-  return i;
-}
-inline size_t plainCopy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) {
-  size_t i = 0;
-#ifdef __SSE2__
-  for (; i + 16 <= n; i += 16) {
-    __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + i));
-    if (lim < 0x100 && _mm_movemask_epi8(x)) break;
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + i), x);
-  }
-#endif
-  return i;
-}
+// A run of plain values, many at a time.
+inline size_t plainCopy(const uint8_t *s, VLUChar *d, size_t n, unsigned lim) { return simd::widenRun(s, d, n, lim); }
+inline size_t plainCopy(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) { return simd::narrowRun(s, d, n, lim); }
+inline size_t plainCopy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) { return simd::copy(s, d, n, lim); }
 
 // ---- Decoders: the bytes of one character to a value ---------------------------------
 
@@ -537,7 +497,6 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
       unsigned lim = 0;
       if constexpr (requires { plainCopy(lr.p, lw.o, n, 0u); }) {
         if (n >= 32) lim = std::min(lr.plainBelow(), lw.plainBelow());
-        if (lim < 0x100) lim = 0;
         if (lim >= 0x80) {
           lim = lim >= 0x100 ? 0x100 : 0x80;
           while (i < n) {
@@ -545,15 +504,31 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
             lr.p += k;
             lw.o += k;
             i += k;
-            // Text that keeps breaking the blocks gets longer stretches between tries.
-            size_t m = std::min<size_t>(n - i, k ? 16 : 256), j = 0;
-            for (; j < m; ++j) {
+            // The run ended at a value that is not plain: convert one by one until a plain
+            // value starts the next run (peeking only while another character is safe).
+            // After a run shorter than a block, a stretch goes one by one first: a table
+            // load per character costs less than starting runs that end at once.
+            size_t m = n - i, j = 0, least = k < 16 ? std::min<size_t>(m, 24) : 0;
+            bool refused = false;
+            for (; j < least && !refused; ++j) {
               Value v;
-              if (!lr.fast(v)) break;
+              if (!lr.fast(v)) {
+                refused = true;
+                break;
+              }
               lw.fast(v);
             }
+            while (!refused && j < m) {
+              Value v;
+              if (!lr.fast(v)) {
+                refused = true;
+                break;
+              }
+              lw.fast(v);
+              if (++j < m && *lr.p < lim) break;
+            }
             i += j;
-            if (j < m) break;
+            if (refused) break;
           }
         }
       }

@@ -1,6 +1,6 @@
 // UTF-16 units to a byte string. A shift-sensitive page gets Shift-Out/Shift-In around
 // its double-byte runs and no terminator; any other page gets a terminating 0.
-#include "codepage/cpprim.h"
+#include "codepage/convert.h"
 
 VL_TRACE_MODULE("vlcpu2s");
 
@@ -44,25 +44,17 @@ int32_t VLCpUnicodeToStr(const VLCodePage *cp, const VLUChar *u, int32_t length,
   if (!usable(cp) || !u || !out) VL_RET(int32_t{0});
   size_t count = length < 0 ? unitCount(u) : static_cast<size_t>(length);
   if (!isUtf8(cp) && isShift(cp)) VL_RET(shifted(cp, u, count, state != 0, out));
-  size_t pos = 0;
-  if (isUtf8(cp)) {
-    for (size_t i = 0; i < count && u[i]; ++i) pos += static_cast<size_t>(uniToUtf8(u[i], out + pos));
-  } else {
-    // The tables are held in locals: every byte stored through out may alias the record.
-    const uint8_t *index = body(cp) + kIndex, *low = lowTable(cp);
-    const uint8_t sub = subst(cp);
-    for (size_t i = 0; i < count && u[i]; ++i) {
-      const VLUChar c = u[i];
-      const uint8_t *x = index + kIndexSize * (c >> 8);
-      const unsigned l = c & 0xFF;
-      if (l < x[2] || l > x[3])
-        out[pos++] = sub;
-      else if (x[0] == 0)
-        out[pos++] = low[vl::rd16(x + 4) + (l & x[1])];
-      else
-        pos += static_cast<size_t>(wToMb(out + pos, indexValue(cp, x, c)));
-    }
-  }
+  // The family's writers: output room is the caller's promise, so it is given as the most
+  // the units can take.
+  size_t n = 0;
+  while (n < count && u[n]) ++n;
+  size_t pos = vl::cnv::withByteWriter(cp, false, out, n * 4, 0, [&](auto &w) {
+    vl::cnv::U16Reader r(u, n);
+    size_t chars = 0;
+    vl::cnv::Value held = 0;
+    vl::cnv::pump(r, w, chars, vl::cnv::kNoLimit, held);
+    return static_cast<size_t>(w.o - w.start);
+  });
   out[pos] = 0;
   VL_RET(static_cast<int32_t>(pos));
 }

@@ -1,0 +1,77 @@
+// Runs of plain characters (values that are the same on both sides of a conversion)
+// copied many at a time: bytes widened to UTF-16 units, units narrowed to bytes, bytes
+// copied. Each call copies the leading run of plain values, at most n, writes nothing
+// past it, and returns its length; the caller converts the character that ended it.
+//
+// SSE2 is the x86-64 baseline; AVX2 is taken when the processor has it; elsewhere a
+// scalar loop. All three give the same output.
+#pragma once
+#include <atomic>
+#include <cstddef>
+#include <cstdint>
+
+#include "veltrin.h"
+
+#if defined(__x86_64__) && defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
+namespace vl::simd {
+
+enum Level : int { kScalar = 0, kSse2 = 1, kAvx2 = 2 };
+
+// The level in use: the best the processor has, unless capped by capLevel.
+extern std::atomic<int> levelNow;
+inline int level() { return levelNow.load(std::memory_order_relaxed); }
+// Caps the level for tests that hold the vector paths against the scalar one; a negative
+// value restores the detected level. Not for use while conversions run on other threads.
+void capLevel(int cap);
+
+// lim is 0x80 (ASCII runs) or 0x100 (every value below 0x100 is plain).
+size_t widen(const uint8_t *s, VLUChar *d, size_t n, unsigned lim);
+size_t narrow(const VLUChar *s, uint8_t *d, size_t n, unsigned lim);
+size_t copy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim);
+
+// The same, with the first block tested in line: runs in prose are mostly shorter than a
+// block, and the call is paid only by runs that go on.
+inline size_t widenRun(const uint8_t *s, VLUChar *d, size_t n, unsigned lim) {
+#if defined(__x86_64__) && defined(__SSE2__)
+  if (n >= 16 && lim < 0x100 && level() != kScalar) {
+    const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s)), z = _mm_setzero_si128();
+    unsigned m = static_cast<unsigned>(_mm_movemask_epi8(x));
+    if (m) {
+      unsigned k = static_cast<unsigned>(__builtin_ctz(m));
+      if (k >= 8) _mm_storeu_si128(reinterpret_cast<__m128i *>(d), _mm_unpacklo_epi8(x, z));
+      for (unsigned j = k & 8; j < k; ++j) d[j] = s[j];
+      return k;
+    }
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d), _mm_unpacklo_epi8(x, z));
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + 8), _mm_unpackhi_epi8(x, z));
+    return 16 + widen(s + 16, d + 16, n - 16, lim);
+  }
+#endif
+  return widen(s, d, n, lim);
+}
+
+inline size_t narrowRun(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) {
+#if defined(__x86_64__) && defined(__SSE2__)
+  if (n >= 16 && level() != kScalar) {
+    const __m128i z = _mm_setzero_si128();
+    const __m128i high = _mm_set1_epi16(static_cast<short>(lim < 0x100 ? 0xFF80 : 0xFF00));
+    __m128i a = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s));
+    __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + 8));
+    __m128i ok = _mm_packs_epi16(_mm_cmpeq_epi16(_mm_and_si128(a, high), z), _mm_cmpeq_epi16(_mm_and_si128(b, high), z));
+    unsigned bad = ~static_cast<unsigned>(_mm_movemask_epi8(ok)) & 0xFFFF;
+    if (bad) {
+      unsigned k = static_cast<unsigned>(__builtin_ctz(bad));
+      for (unsigned j = 0; j < k; ++j) d[j] = static_cast<uint8_t>(s[j]);
+      return k;
+    }
+    _mm_storeu_si128(reinterpret_cast<__m128i *>(d), _mm_packus_epi16(a, b));
+    return 16 + narrow(s + 16, d + 16, n - 16, lim);
+  }
+#endif
+  return narrow(s, d, n, lim);
+}
+
+}  // namespace vl::simd
