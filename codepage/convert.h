@@ -497,6 +497,9 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
       unsigned lim = 0;
       if constexpr (requires { plainCopy(lr.p, lw.o, n, 0u); }) {
         if (n >= 32) lim = std::min(lr.plainBelow(), lw.plainBelow());
+        // Runs pay only where every byte is plain: in other pages the runs of real text
+        // are shorter than a block, and the table loop below is faster there.
+        if (lim < 0x100) lim = 0;
         if (lim >= 0x80) {
           lim = lim >= 0x100 ? 0x100 : 0x80;
           while (i < n) {
