@@ -73,8 +73,9 @@ void workout(VLLocale *l, const uint8_t *text, size_t size) {
   VLNumChars(l, s.data(), int32_t(size));
   int32_t steps = 0;
   for (const char *p = s.data(), *end = s.data() + size; p && p < end && steps < 4096; ++steps) {
-    VLGetCharType(l, p, 0);
+    // Calls without a length take a whole character: never hand them a cut one.
     if (VLByteLength(l, p) > end - p) break;
+    VLGetCharType(l, p, 0);
     p = VLNextChar(l, p);
   }
   uint32_t kind;
