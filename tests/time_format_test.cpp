@@ -2,17 +2,14 @@
 // ranges, malformed patterns, every buffer size around the text, shift-sensitive output,
 // the four forms and the writers.
 #include <gtest/gtest.h>
-#include <iconv.h>
 
 #include <clocale>
 #include <cstring>
 #include <ctime>
-#include <filesystem>
-#include <memory>
 #include <string>
 #include <vector>
 
-#include "support/timefix.h"
+#include "support/gendefs.h"
 #include "veltrin.h"
 
 namespace {
@@ -33,7 +30,7 @@ std::tm at(int year, int mon, int mday, int hour = 0, int min = 0, int sec = 0) 
 
 using ts::iconvTo;
 
-class TimeFormat : public ts::TimeTest {
+class TimeFormat : public ts::DefsTest {
  protected:
   // The text, or "<rc>" on failure.
   static std::string fmt(VLLocale *l, const std::tm &t, const std::string &pattern, uint32_t options = 0,
@@ -95,9 +92,7 @@ TEST_F(TimeFormat, NestedPatternsAreTheLocalesOwn) {
     VLLocale *l = loc(name);
     ASSERT_NE(l, nullptr);
     char p79[128], p80[128], p81[128];
-    ASSERT_GT(VLGetLocaleTextInfo(l, 79, p79, sizeof p79, 0), 1);
-    ASSERT_GT(VLGetLocaleTextInfo(l, 80, p80, sizeof p80, 0), 1);
-    ASSERT_GT(VLGetLocaleTextInfo(l, 81, p81, sizeof p81, 0), 1);
+    for (auto [item, p] : {std::pair{79, p79}, {80, p80}, {81, p81}}) ASSERT_GT(VLGetLocaleTextInfo(l, item, p, 128, 0), 1);
     std::tm t = at(2024, 3, 5, 14, 7, 9);
     EXPECT_EQ(fmt(l, t, "%x"), fmt(l, t, p80)) << name;
     EXPECT_EQ(fmt(l, t, "%#x"), fmt(l, t, p81)) << name;

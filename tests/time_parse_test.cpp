@@ -1,17 +1,15 @@
 // Times read by patterns: numbers and words, the AM/PM adjustment, nested patterns,
 // fields left alone, shift-sensitive input, the readers, and hostile patterns and text.
 #include <gtest/gtest.h>
-#include <iconv.h>
 
 #include <cstring>
 #include <ctime>
-#include <filesystem>
 #include <memory>
 #include <random>
 #include <string>
 #include <vector>
 
-#include "support/timefix.h"
+#include "support/gendefs.h"
 #include "veltrin.h"
 
 namespace {
@@ -23,8 +21,8 @@ std::tm sentinel() {
   return t;
 }
 
-const auto toPage = ts::iconvTo;
-using TimeParse = ts::TimeTest;
+using ts::iconvTo;
+using TimeParse = ts::DefsTest;
 
 struct Fields {
   int year = -77, mon = -77, mday = -77, hour = -77, min = -77, sec = -77, wday = -77, yday = -77;
@@ -184,7 +182,7 @@ TEST_F(TimeParse, ShiftSensitiveInput) {
   VLLocale *l = loc("Japanese_Japan.IBM930");
   ASSERT_NE(l, nullptr);
   const std::string so = "\x0E", si = "\x0F";
-  const std::string nen = toPage("年", "IBM930").substr(1, 2), getsu = toPage("月", "IBM930").substr(1, 2);
+  const std::string nen = iconvTo("年", "IBM930").substr(1, 2), getsu = iconvTo("月", "IBM930").substr(1, 2);
   struct Case {
     const char *what;
     std::string pattern, input;
@@ -192,13 +190,13 @@ TEST_F(TimeParse, ShiftSensitiveInput) {
     int32_t consumed;
     Fields want;
   } cases[] = {
-      {"the short date", toPage("%x", "IBM930"), toPage("2024年03月05日", "IBM930"), 0, 20,
+      {"the short date", iconvTo("%x", "IBM930"), iconvTo("2024年03月05日", "IBM930"), 0, 20,
        Fields{124, 2, 5, -77, -77, -77, -77, -77}},
-      {"a day name and the afternoon", toPage("%A %p%I", "IBM930"), toPage("火曜日 午後02", "IBM930"), 0, 17,
+      {"a day name and the afternoon", iconvTo("%A %p%I", "IBM930"), iconvTo("火曜日 午後02", "IBM930"), 0, 17,
        Fields{-77, -77, -77, 14, -77, -77, 2, -77}},
-      {"runs the input joins that the pattern keeps apart", so + nen + si + so + getsu + si + toPage("%m", "IBM930"),
+      {"runs the input joins that the pattern keeps apart", so + nen + si + so + getsu + si + iconvTo("%m", "IBM930"),
        so + nen + getsu + si + "\xF0\xF3", 0, 8, Fields{-77, 2, -77, -77, -77, -77, -77, -77}},
-      {"input that begins double-byte", so + nen + si + toPage("%d", "IBM930"), nen + si + "\xF0\xF5", 1, 5,
+      {"input that begins double-byte", so + nen + si + iconvTo("%d", "IBM930"), nen + si + "\xF0\xF5", 1, 5,
        Fields{-77, -77, 5, -77, -77, -77, -77, -77}},
   };
   for (const Case &c : cases) {
