@@ -6,18 +6,16 @@
 #include <clocale>
 #include <cstdlib>
 #include <cstring>
-#include <filesystem>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "support/defdir.h"
-#include "support/hooks.h"
+#include "support/gendefs.h"
 #include "veltrin.h"
 
 namespace {
 
-namespace fs = std::filesystem;
 
 std::string mapped(const char *native, int32_t size = 132) {
   char out[132];
@@ -51,20 +49,7 @@ TEST(NativeNames, MapSimpleAndCompositeNames) {
   EXPECT_EQ(mapped("C", 1), "");
 }
 
-class Native : public ::testing::Test {
- protected:
-  void SetUp() override {
-    if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
-    lib_ = std::make_unique<ts::Library>(VL_TEST_DEFS_DIR);
-    ASSERT_EQ(lib_->rc, 0u);
-  }
-  void TearDown() override {
-    if (!lib_) return;
-    lib_.reset();
-    EXPECT_EQ(ts::hooks.live, 0);
-  }
-  std::unique_ptr<ts::Library> lib_;
-};
+using Native = ts::DefsTest;
 
 std::string nameOf(const VLLocale *l) {
   return std::string(l->language->name) + "_" + l->territory->name + "." + l->codePage->name + "@" +
@@ -164,26 +149,7 @@ TEST_F(Native, ReverseMapping) {
   }
 }
 
-// Sets or unsets a variable for one scope.
-struct EnvScope {
-  std::string name, old;
-  bool had;
-  EnvScope(const char *n, const char *v) : name(n) {
-    const char *o = std::getenv(n);
-    had = o != nullptr;
-    if (o) old = o;
-    if (v)
-      setenv(n, v, 1);
-    else
-      unsetenv(n);
-  }
-  ~EnvScope() {
-    if (had)
-      setenv(name.c_str(), old.c_str(), 1);
-    else
-      unsetenv(name.c_str());
-  }
-};
+using ts::EnvScope;
 
 TEST(NativeUser, UserLocaleFromTheEnvironment) {
   const std::string before = std::setlocale(LC_ALL, nullptr);
@@ -208,8 +174,7 @@ class NativeInfo : public Native {
  protected:
   static void SetUpTestSuite() {
     dir_ = new ts::TempDir;
-    std::string cmd = "localedef -c -i de_DE -f ISO-8859-1 " + dir_->file("de_DE") + " >/dev/null 2>&1";
-    built_ = std::system(cmd.c_str()) == 0 || fs::exists(dir_->file("de_DE") + "/LC_NUMERIC");
+    built_ = ts::localedef("de_DE", "ISO-8859-1", dir_->file("de_DE"));
   }
   static void TearDownTestSuite() { delete dir_; }
   void SetUp() override {

@@ -7,9 +7,7 @@
 #include <cmath>
 #include <cstdlib>
 #include <cstring>
-#include <filesystem>
 #include <functional>
-#include <langinfo.h>
 #include <memory>
 #include <monetary.h>
 #include <random>
@@ -18,44 +16,23 @@
 
 #include "store/store.h"
 #include "support/defdir.h"
-#include "support/hooks.h"
+#include "support/gendefs.h"
 
 namespace {
 
-namespace fs = std::filesystem;
 const char *const kPages[] = {"Latin1", "MS1252", "UTF-8", "MS932", "IBM930", "IBM037"};
 
-class Num : public ::testing::Test {
+class Num : public ts::DefsTest {
  protected:
-  void SetUp() override {
-    if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
-    lib_ = std::make_unique<ts::Library>(VL_TEST_DEFS_DIR);
-    ASSERT_EQ(lib_->rc, 0u);
-  }
-  void TearDown() override {
-    for (VLLocale *l : open_) VLReleaseLocale(l);
-    if (!lib_) return;
-    lib_.reset();
-    EXPECT_EQ(ts::hooks.live, 0);
-  }
-  VLLocale *open(const std::string &name) {
-    uint32_t rc = 0;
-    VLLocale *l = VLGetLocale(name.c_str(), 0, &rc);
-    EXPECT_NE(l, nullptr) << name << " rc " << rc;
-    if (l) open_.push_back(l);
-    return l;
-  }
   // An English locale with the separators and grouping of the rule tables.
   VLLocale *ruled(const char *grouping = "3;0", const char *group = ",", const char *decimal = ".") {
-    VLLocale *l = open("English_UnitedStates.Latin1");
+    VLLocale *l = loc("English_UnitedStates.Latin1");
     EXPECT_EQ(VLSetLocaleTextInfo(l, 60, "x", 1, 0), 1);  // out of the way of the next two
     EXPECT_EQ(VLSetLocaleTextInfo(l, 59, decimal, 1, 0), 1);
     EXPECT_EQ(VLSetLocaleTextInfo(l, 60, group, 1, 0), 1);
     EXPECT_EQ(VLSetLocaleTextInfo(l, 62, grouping, -1, 0), 1);
     return l;
   }
-  std::unique_ptr<ts::Library> lib_;
-  std::vector<VLLocale *> open_;
 };
 
 std::string fmtLong(VLLocale *l, int32_t v, uint32_t opts = 0, int32_t size = 64) {
@@ -109,7 +86,7 @@ TEST_F(Num, IntegersAreGroupedAsTheGroupingTextSays) {
 }
 
 TEST_F(Num, GroupingSizesAreWalkedOneByOne) {
-  VLLocale *l = open("English_UnitedStates.Latin1");
+  VLLocale *l = loc("English_UnitedStates.Latin1");
   char g[] = "3;12;0";
   int32_t rest = 6;
   char *next = g;
@@ -125,7 +102,7 @@ TEST_F(Num, GroupingSizesAreWalkedOneByOne) {
   rest = 5;
   EXPECT_EQ(VLStrGroupingSize(l, nullptr, &rest, &next), -1);
   // EBCDIC digits and separator in the wide form of an EBCDIC page.
-  VLLocale *e = open("English_UnitedStates.IBM037");
+  VLLocale *e = loc("English_UnitedStates.IBM037");
   VLWChar w[] = {0xF3, 0x5E, 0xF2, 0};
   VLWChar *wn = w;
   rest = -1;
@@ -257,7 +234,7 @@ TEST_F(Num, TheTokenReaderClassifiesOneTokenAtATime) {
 
 // Digits of other scripts: always in the U and W forms, with VL_NUM_DIGITS in the byte forms.
 TEST_F(Num, DigitsOfAnyScript) {
-  VLLocale *l = open("Japanese_Japan.MS932");
+  VLLocale *l = loc("Japanese_Japan.MS932");
   ASSERT_NE(l, nullptr);
   struct Row {
     std::u16string text;
@@ -404,12 +381,8 @@ TEST_F(Num, SignPositionsPlaceSignSymbolAndBlank) {
       {2.9999996, 1, 1, 0, "$3.00"},
   };
   VLLocale *l = ruled();
-  ASSERT_EQ(VLSetLocaleTextInfo(l, 64, "$", -1, 0), 1);
-  ASSERT_EQ(VLSetLocaleTextInfo(l, 71, "", 0, 0), 1);
-  ASSERT_EQ(VLSetLocaleTextInfo(l, 72, "-", -1, 0), 1);
-  ASSERT_EQ(VLSetLocaleTextInfo(l, 66, ".", -1, 0), 1);
-  ASSERT_EQ(VLSetLocaleTextInfo(l, 67, ",", -1, 0), 1);
-  ASSERT_EQ(VLSetLocaleTextInfo(l, 68, "3;0", -1, 0), 1);
+  for (auto [item, text] : {std::pair{64, "$"}, {72, "-"}, {66, "."}, {67, ","}, {68, "3;0"}})
+    ASSERT_EQ(VLSetLocaleTextInfo(l, item, text, -1, 0), 1) << item;
   ASSERT_EQ(VLSetLocaleNumInfo(l, 69, 2, 0), 1);
   for (const Row &r : rows) {
     const bool neg = r.amount < 0;
@@ -424,7 +397,7 @@ TEST_F(Num, SignPositionsPlaceSignSymbolAndBlank) {
 
 // A yen sign of the double-byte set comes with its shift bytes, in every form.
 TEST_F(Num, DoubleByteSymbolsInShiftSensitivePages) {
-  VLLocale *l = open("Japanese_Japan.IBM930");
+  VLLocale *l = loc("Japanese_Japan.IBM930");
   ASSERT_NE(l, nullptr);
   const VLUChar yen[] = {0xFFE5, 0};
   ASSERT_EQ(VLSetLocaleTextInfoU(l, 64, yen, -1, 0), 1);
@@ -453,7 +426,7 @@ TEST_F(Num, DoubleByteSymbolsInShiftSensitivePages) {
 // Every size below the whole: code 40, whole characters, no open shift run, a prefix.
 TEST_F(Num, ShortBuffersCutAtCharacterBoundaries) {
   for (const char *page : {"Latin1", "UTF-8", "MS932", "IBM930"}) {
-    VLLocale *l = open(std::string("Japanese_Japan.") + page);
+    VLLocale *l = loc(std::string("Japanese_Japan.") + page);
     ASSERT_NE(l, nullptr);
     const VLUChar sym[] = {0xFFE5, 0x5186, 0};
     ASSERT_EQ(VLSetLocaleTextInfoU(l, 64, sym, -1, 0), 1);
@@ -535,7 +508,7 @@ TEST_F(Num, EveryTerritoryRoundTripsInEveryPageAndForm) {
   for (const std::string &t : territories) {
     for (const char *page : kPages) {
       const std::string name = "English_" + t + "." + page;
-      VLLocale *l = open(name);
+      VLLocale *l = loc(name);
       if (!l) continue;
       for (int32_t v : {0, 1, -1, INT32_MAX, INT32_MIN, 999, 1000, -1000}) {
         roundTrip(l, v, 0, name);
@@ -556,7 +529,7 @@ TEST_F(Num, EveryTerritoryRoundTripsInEveryPageAndForm) {
 TEST_F(Num, RandomBytesAndLongRunsAreReadWithinTheirLength) {
   std::mt19937 rng(7);
   for (const char *page : kPages) {
-    VLLocale *l = open(std::string("English_UnitedStates.") + page);
+    VLLocale *l = loc(std::string("English_UnitedStates.") + page);
     ASSERT_NE(l, nullptr);
     for (int i = 0; i < 400; ++i) {
       const size_t len = rng() % 40;
@@ -608,11 +581,8 @@ class NumNative : public Num {
  protected:
   static void SetUpTestSuite() {
     dir_ = new ts::TempDir;
-    for (const Oracle &o : kOracles) {
-      std::string cmd = std::string("localedef -c -i ") + o.native + " -f UTF-8 " + dir_->file(name(o)) +
-                        " >/dev/null 2>&1";
-      if (std::system(cmd.c_str()) == 0 || fs::exists(dir_->file(name(o)) + "/LC_NUMERIC")) built_.push_back(o);
-    }
+    for (const Oracle &o : kOracles)
+      if (ts::localedef(o.native, "UTF-8", dir_->file(name(o)))) built_.push_back(o);
   }
   // With its code set named, so that no alias of the bare name is taken instead.
   static std::string name(const Oracle &o) { return std::string(o.native) + ".UTF-8"; }
@@ -622,25 +592,26 @@ class NumNative : public Num {
   }
   void SetUp() override {
     if (built_.empty()) GTEST_SKIP() << "localedef built none of the oracle locales";
-    setenv("LOCPATH", dir_->path.c_str(), 1);
+    locpath_ = std::make_unique<ts::EnvScope>("LOCPATH", dir_->path.c_str());
     saved_ = std::setlocale(LC_ALL, nullptr);
     Num::SetUp();
   }
   void TearDown() override {
     std::setlocale(LC_ALL, saved_.c_str());
-    unsetenv("LOCPATH");
+    locpath_.reset();
     Num::TearDown();
   }
   static inline ts::TempDir *dir_ = nullptr;
   static inline std::vector<Oracle> built_;
   std::string saved_;
+  std::unique_ptr<ts::EnvScope> locpath_;
 };
 
 TEST_F(NumNative, GroupingAgreesWithPrintf) {
   std::mt19937 rng(3);
   for (const Oracle &o : built_) {
     ASSERT_NE(std::setlocale(LC_ALL, name(o).c_str()), nullptr) << o.native;
-    VLLocale *l = open(o.ours);
+    VLLocale *l = loc(o.ours);
     ASSERT_NE(l, nullptr);
     for (int i = 0; i < 300; ++i) {
       const int32_t v = i < 4 ? (int32_t[]){0, -1, INT32_MAX, INT32_MIN}[i] : static_cast<int32_t>(rng()) >> (i % 31);
@@ -657,7 +628,7 @@ TEST_F(NumNative, CurrencyAgreesWithStrfmon) {
   const double amounts[] = {0, 7, 1234.5, -1234.56, 1234567.89, -0.25, 99999.99, 1234.567, -8.999};
   for (const Oracle &o : built_) {
     ASSERT_NE(std::setlocale(LC_ALL, name(o).c_str()), nullptr) << o.native;
-    VLLocale *l = open(o.ours);
+    VLLocale *l = loc(o.ours);
     ASSERT_NE(l, nullptr);
     const lconv *lc = std::localeconv();
     const int frac = lc->frac_digits;
@@ -703,7 +674,7 @@ std::string run(const std::string &args, const std::string &input = "", int *sta
 }
 
 TEST(NumTool, FormatAndParseFromArgumentsAndLines) {
-  if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
+  if (!ts::haveDefs()) GTEST_SKIP() << "no generated definitions";
   int st = -1;
   EXPECT_EQ(run("format number --locale German_Germany.UTF-8 1234567 -1234.5678", "", &st), "1.234.567\n-1.234,56\n");
   EXPECT_EQ(st, 0);
