@@ -89,12 +89,6 @@ TEST_F(Alias, Lookup) {
     else
       EXPECT_EQ(got, nullptr) << name;
   }
-  // An alias names a code page in a locale name.
-  uint32_t rc;
-  VLLocale *l = VLGetLocale("German.l1", 0, &rc);
-  ASSERT_NE(l, nullptr);
-  EXPECT_STREQ(l->codePage->name, "Latin1");
-  VLReleaseLocale(l);
 }
 
 // Special-case tables 44 and 45 of a language body: entries of key pair and result pair.

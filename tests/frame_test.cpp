@@ -153,11 +153,7 @@ TEST(Init, CountedAndFirstCallWins) {
   VLLocale *l = VLGetLocale("", 0, &rc);
   ASSERT_NE(l, nullptr);
   EXPECT_GT(ts::hooks.allocs, before);  // still the first call's hooks
-  EXPECT_STREQ(l->language->name, "English");
-  EXPECT_STREQ(l->territory->name, "UnitedStates");
-  EXPECT_STREQ(l->codePage->name, "US-ASCII");
-  EXPECT_EQ(l->flags & (VL_LF_BINARY | VL_LF_SINGLEBYTE), VL_LF_BINARY | VL_LF_SINGLEBYTE);
-  EXPECT_STREQ(l->texts[1], "$");
+  EXPECT_STREQ(l->codePage->name, "US-ASCII");  // the built-in locale
   EXPECT_EQ(VLReleaseLocale(l), 0u);
   EXPECT_EQ(VLTerm(), 0u);
   EXPECT_EQ(vlglobals, nullptr);

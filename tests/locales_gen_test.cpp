@@ -8,10 +8,13 @@
 #include <fstream>
 #include <map>
 #include <set>
+#include <span>
 
+#include "locale/native.h"
 #include "locales.h"
 #include "locsrc_parse.h"
 #include "locsrc_pattern.h"
+#include "support/gendefs.h"
 
 namespace {
 
@@ -22,12 +25,8 @@ using mkdefs::locsrc::toUtf8;
 
 const char *kSrc = "/usr/share/i18n/locales";
 
-struct NatRow {
-  const char *native, *language, *territory, *codePage, *sort;
-};
-const NatRow kNat[] = {
-#include "locale/nattab.inc"
-};
+using NatRow = vl::nat::Row;
+const std::span<const NatRow> kNat(vl::nat::kRows, vl::nat::kRowCount);
 
 const std::map<std::string, uint16_t> kCpIds = {
     {"US-ASCII", 367}, {"Latin1", 819},     {"ISO-8859-2", 912}, {"ISO-8859-5", 915},
@@ -130,32 +129,20 @@ TEST_F(Generated, LanguageIdsNeverMove) {
   EXPECT_EQ(text8(get(1, "Spain"), 20), "%d/%m/%y");
 }
 
+// What the compiled en_US does not report; its names and patterns are compared below.
 TEST_F(Generated, EnglishAndUnitedStates) {
   const DefObject &en = get(0, "English");
   EXPECT_EQ(word(en, 0), 840);
   EXPECT_EQ(word(en, 1), 367);
   EXPECT_EQ(word(en, 2), 0);
-  const char *days[] = {"Sunday", "Monday", "Tuesday", "Wednesday", "Thursday", "Friday", "Saturday"};
-  const char *months[] = {"January", "February", "March",     "April",   "May",      "June",
-                          "July",    "August",   "September", "October", "November", "December"};
-  for (size_t i = 0; i < 7; ++i) {
-    EXPECT_EQ(text8(en, 7 + i), days[i]);
-    EXPECT_EQ(text8(en, 14 + i), std::string(days[i], 3));
-  }
-  for (size_t i = 0; i < 12; ++i) {
-    EXPECT_EQ(text8(en, 21 + i), months[i]);
-    EXPECT_EQ(text8(en, 34 + i), std::string(months[i], 3));
-  }
-  const std::pair<size_t, const char *> enTexts[] = {{5, "en"}, {6, "English"}, {33, ""}, {46, ""}, {47, "AM"}, {48, "PM"}};
-  for (const auto &[w, want] : enTexts) EXPECT_EQ(text8(en, w), want) << "word " << w;
-
+  EXPECT_EQ(text8(en, 5), "en");
+  EXPECT_EQ(text8(en, 6), "English");
   const DefObject &us = get(1, "UnitedStates");
   const std::pair<size_t, uint16_t> usWords[] = {{0, '.'}, {1, ','}, {3, '.'}, {4, ','}, {5, 2}, {6, 2},
                                                  {7, 2},   {8, 0x0101}, {9, 840}, {10, 0x0A}};
   for (const auto &[w, want] : usWords) EXPECT_EQ(word(us, w), want) << "word " << w;
   const std::pair<size_t, const char *> usTexts[] = {
-      {11, "US"}, {12, "United States"}, {13, "3;3;0"}, {14, "3;3;0"}, {15, "$"}, {16, "USD"}, {17, ""},
-      {18, "-"},  {19, "%I:%M:%S %p"},   {20, "%m/%d/%Y"}, {21, "%A %B %#d %Y"}};
+      {11, "US"}, {12, "United States"}, {13, "3;3;0"}, {14, "3;3;0"}, {17, ""}, {18, "-"}};
   for (const auto &[w, want] : usTexts) EXPECT_EQ(text8(us, w), want) << "word " << w;
 }
 
@@ -180,8 +167,6 @@ TEST_F(Generated, LanguageDefaultsAndTellingValues) {
     EXPECT_EQ(word(o, 1), cpId(w.codePage)) << w.language;  // 0 for names the fake does not know
     EXPECT_EQ(text8(o, 5), w.code) << w.language;
   }
-  EXPECT_EQ(text8(get(0, "German"), 7), "Sonntag");
-  EXPECT_EQ(text8(get(0, "German"), 23), "März");
   EXPECT_EQ(word(get(1, "France"), 0), ',');
   EXPECT_EQ(word(get(1, "Germany"), 1), '.');
   for (size_t w = 21; w <= 32; ++w) EXPECT_FALSE(text(get(0, "Japanese"), w).empty());
@@ -226,27 +211,24 @@ TEST_F(Generated, BodiesAreWellFormed) {
 TEST_F(Generated, AgreesWithCompiledLocales) {
   fs::path dir = fs::temp_directory_path() / ("vl_locgen_" + std::to_string(getpid()));
   fs::create_directories(dir);
-  const char *sources[] = {"de_DE", "ja_JP", "zh_TW", "lt_LT", "et_EE", "lv_LV", "uk_UA", "ca_ES", "es_ES"};
-  for (const char *s : sources) {
-    std::string cmd = "localedef -i " + std::string(s) + " -f UTF-8 " + (dir / (std::string(s) + ".UTF-8")).string() +
-                      " >/dev/null 2>&1";
-    if (std::system(cmd.c_str()) == -1 || !fs::exists(dir / (std::string(s) + ".UTF-8") / "LC_TIME")) {
+  const char *sources[] = {"en_US", "de_DE", "ja_JP", "zh_TW", "lt_LT", "et_EE", "lv_LV", "uk_UA", "ca_ES", "es_ES"};
+  for (const char *s : sources)
+    if (!ts::localedef(s, "UTF-8", (dir / (std::string(s) + ".UTF-8")).string())) {
       fs::remove_all(dir);
       GTEST_SKIP() << "localedef unavailable";
     }
-  }
-  const char *oldPath = getenv("LOCPATH");
-  std::string saved = oldPath ? oldPath : "";
-  setenv("LOCPATH", dir.c_str(), 1);
   std::map<std::string, locale_t> loc;
-  for (const char *s : sources) loc[s] = newlocale(LC_ALL_MASK, (std::string(s) + ".UTF-8").c_str(), nullptr);
-  oldPath ? setenv("LOCPATH", saved.c_str(), 1) : unsetenv("LOCPATH");
+  {
+    ts::EnvScope locpath("LOCPATH", dir.c_str());
+    for (const char *s : sources) loc[s] = newlocale(LC_ALL_MASK, (std::string(s) + ".UTF-8").c_str(), nullptr);
+  }
   fs::remove_all(dir);
 
   auto info = [&](const std::string &s, nl_item item) { return fromUtf8(nl_langinfo_l(item, loc[s])); };
   const std::pair<const char *, const char *> languages[] = {
-      {"German", "de_DE"},  {"Japanese", "ja_JP"}, {"TraditionalChinese", "zh_TW"}, {"Lithuanian", "lt_LT"},
-      {"Estonian", "et_EE"}, {"Latvian", "lv_LV"},  {"Ukrainian", "uk_UA"},           {"Catalan", "ca_ES"}};
+      {"English", "en_US"},    {"German", "de_DE"},  {"Japanese", "ja_JP"},  {"TraditionalChinese", "zh_TW"},
+      {"Lithuanian", "lt_LT"}, {"Estonian", "et_EE"}, {"Latvian", "lv_LV"}, {"Ukrainian", "uk_UA"},
+      {"Catalan", "ca_ES"}};
   for (const auto &[name, s] : languages) {
     ASSERT_NE(loc[s], nullptr) << s;
     const DefObject &o = get(0, name);
@@ -262,8 +244,8 @@ TEST_F(Generated, AgreesWithCompiledLocales) {
     EXPECT_EQ(text(o, 48), info(s, PM_STR)) << name;
   }
   const std::pair<const char *, const char *> territories[] = {
-      {"Germany", "de_DE"},  {"Japan", "ja_JP"},   {"Taiwan", "zh_TW"},  {"Lithuania", "lt_LT"},
-      {"Estonia", "et_EE"}, {"Latvia", "lv_LV"}, {"Ukraine", "uk_UA"}, {"Spain", "es_ES"}};
+      {"UnitedStates", "en_US"}, {"Germany", "de_DE"}, {"Japan", "ja_JP"},  {"Taiwan", "zh_TW"}, {"Lithuania", "lt_LT"},
+      {"Estonia", "et_EE"},      {"Latvia", "lv_LV"},  {"Ukraine", "uk_UA"}, {"Spain", "es_ES"}};
   for (const auto &[name, s] : territories) {
     ASSERT_NE(loc[s], nullptr) << s;
     const DefObject &o = get(1, name);

@@ -13,9 +13,11 @@
 #include <map>
 #include <memory>
 #include <set>
+#include <span>
 #include <string>
 #include <vector>
 
+#include "locale/native.h"
 #include "support/defdir.h"
 #include "support/gendefs.h"
 #include "veltrin.h"
@@ -24,12 +26,8 @@ namespace {
 
 namespace fs = std::filesystem;
 
-struct NatRow {
-  const char *native, *language, *territory, *codePage, *sort;
-};
-const NatRow kNat[] = {
-#include "locale/nattab.inc"
-};
+using NatRow = vl::nat::Row;
+const std::span<const NatRow> kNat(vl::nat::kRows, vl::nat::kRowCount);
 
 std::tm at(int year, int yday, int hour) {
   std::tm t{};
