@@ -1,9 +1,7 @@
 // The definition writer: container bytes, Unicode type words, and code page objects built
 // from small sources and read back through the library's load check and primitives.
 #include <gtest/gtest.h>
-#include <unistd.h>
 
-#include <filesystem>
 #include <map>
 
 #include "container.h"
@@ -285,42 +283,6 @@ TEST(DefsCodePage, OverflowNamesTheSection) {
   std::string err;
   EXPECT_FALSE(buildCodePage(s, ucd(), &cp, &err));
   EXPECT_NE(err.find("section 1 (conversion trie)"), std::string::npos) << err;
-}
-
-// The first-generation layout, loaded through the object manager, upgrades to the
-// current one and answers like it.
-TEST(DefsCodePage, FirstGenerationLoadsLikeTheCurrent) {
-  ASSERT_EQ(vlglobals, nullptr);
-  const CpSource src = sample();
-  CpSections v2, v1;
-  std::string err;
-  ASSERT_TRUE(buildCodePage(src, ucd(), &v2, &err)) << err;
-  ASSERT_TRUE(toGeneration1(v2, &v1, &err)) << err;
-  EXPECT_EQ(v1.sections[0].size(), v2.sections[0].size() - 4);
-
-  char tmpl[] = "/tmp/vldefsXXXXXX";
-  ASSERT_TRUE(mkdtemp(tmpl));
-  const std::string dir = tmpl;
-  Bytes f1, f2, ctl;
-  ASSERT_TRUE(containerFile(v1.sections, 1, &f1, &err) && containerFile(v2.sections, 2, &f2, &err));
-  ASSERT_TRUE(controlFile({{9001, 2, "One"}, {9002, 2, "Two"}}, &ctl, &err));
-  ASSERT_TRUE(writeFile(dir + "/cp_09001.nls", f1, &err) && writeFile(dir + "/cp_09002.nls", f2, &err) &&
-              writeFile(dir + "/control.nls", ctl, &err));
-  ASSERT_EQ(VLInit(dir.c_str(), nullptr, nullptr, 0, VL_OPT_NOBUILTIN), 0u);
-  uint32_t rc = 0;
-  const VLCodePage *old = VLGetObjFromID(vlglobals->objManager, 2, 9001, 0, &rc);
-  const VLCodePage *cur = VLGetObjFromID(vlglobals->objManager, 2, 9002, 0, &rc);
-  ASSERT_TRUE(old && cur) << rc;
-  for (unsigned lead : {0x81u, 0x82u, 0x88u, 0x9Fu, 0xE0u})
-    for (unsigned t = 0; t < 256; ++t) {
-      const unsigned char c[4] = {static_cast<unsigned char>(lead), static_cast<unsigned char>(t), 0, 0};
-      ASSERT_EQ(VLCpMbToUnicode(old, c), VLCpMbToUnicode(cur, c)) << lead << ' ' << t;
-      ASSERT_EQ(VLGetMbCtype(old, c)->type, VLGetMbCtype(cur, c)->type) << lead << ' ' << t;
-    }
-  for (unsigned u = 0; u <= 0xFFFF; ++u)
-    ASSERT_EQ(VLCpUnicodeToCharW(old, static_cast<VLUChar>(u)), VLCpUnicodeToCharW(cur, static_cast<VLUChar>(u)));
-  EXPECT_EQ(VLTerm(), 0u);
-  std::filesystem::remove_all(dir);
 }
 
 }  // namespace

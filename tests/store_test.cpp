@@ -194,46 +194,6 @@ TEST_F(Store, BrokenControlFileMeansBuiltins) {
   }
 }
 
-TEST_F(Store, FirstGenerationCodePageUpgradesOnLoad) {
-  ts::TempDir d;
-  ts::DefDir defs;
-  defs.add(0, 1, "English", {ts::languageBody(840, 932, 0, u"en", u"English")});
-  defs.add(1, 840, "UnitedStates", {ts::territoryBody(u"$", u"US")});
-  defs.addCodePage(ts::doubleByteSource(932, "MS932"));
-  defs.addCodePage(ts::doubleByteSource(933, "Old932"), true);
-  defs.addCodePage(ts::singleByteSource(819, "Latin1"));
-  defs.addCodePage(ts::singleByteSource(820, "OldLatin1"), true);
-  defs.write(d.path);
-  ts::Library lib(d.path.c_str());
-  uint32_t rc;
-  for (auto [now, old] : {std::pair<uint16_t, uint16_t>{932, 933}, {819, 820}}) {
-    VLObjEntry *a = VLGetObjFromID(manager(), 2, now, 0, &rc);
-    VLObjEntry *b = VLGetObjFromID(manager(), 2, old, 0, &rc);
-    ASSERT_EQ(rc, 0u);
-    ASSERT_NE(b, nullptr);
-    EXPECT_TRUE(b->flags & 0x02);
-    // The upgrade keeps no variable tables of a single-byte page: its one-byte type
-    // records are gone, and the upgraded body is the header alone.
-    const bool single = now == 819;
-    ASSERT_EQ(b->sectionSize[0], single ? vl::cp::kHeader : a->sectionSize[0]);
-    EXPECT_EQ(std::memcmp(a->section[0], b->section[0], single ? vl::cp::kFullOff : vl::cp::kValueOff), 0);
-    // Every character converts the same through both.
-    unsigned char s[2];
-    for (int lead = 0x81; lead <= 0x9F && now == 932; ++lead)
-      for (int t = 0x30; t < 0x100; ++t) {
-        s[0] = static_cast<uint8_t>(lead);
-        s[1] = static_cast<uint8_t>(t);
-        ASSERT_EQ(VLCpMbToUnicode(a, s), VLCpMbToUnicode(b, s)) << lead << " " << t;
-      }
-    for (int u = 0; u < 0x10000; u += 7) {
-      unsigned char x[4], y[4];
-      int n = VLCpUnicodeToChar(a, static_cast<VLUChar>(u), x);
-      ASSERT_EQ(n, VLCpUnicodeToChar(b, static_cast<VLUChar>(u), y));
-      ASSERT_EQ(std::memcmp(x, y, static_cast<size_t>(n)), 0);
-    }
-  }
-}
-
 TEST_F(Store, ConcurrentFirstUseLoadsOnce) {
   ts::Library lib(dir_->path.c_str());
   std::vector<std::thread> threads;

@@ -134,17 +134,11 @@ mkdefs::CpSource shiftSource(uint16_t id, const std::string &name) {
   return s;
 }
 
-void DefDir::addCodePage(const mkdefs::CpSource &src, bool firstGeneration) {
+void DefDir::addCodePage(const mkdefs::CpSource &src) {
   mkdefs::CpSections cs;
   std::string err;
   if (!mkdefs::buildCodePage(src, unicode(), &cs, &err)) throw std::runtime_error("code page: " + err);
-  if (firstGeneration) {
-    mkdefs::CpSections v1;
-    if (!mkdefs::toGeneration1(cs, &v1, &err)) throw std::runtime_error("generation 1: " + err);
-    add(2, src.id, src.name, v1.sections, 1);
-  } else {
-    add(2, src.id, src.name, cs.sections, 2);
-  }
+  add(2, src.id, src.name, cs.sections, 2);
 }
 
 DefDir DefDir::standard() {

@@ -52,7 +52,7 @@ struct DefDir {
   void add(uint8_t type, uint16_t id, const std::string &name, std::vector<Bytes> sections, uint32_t gen = 2) {
     objects.push_back({type, id, name, std::move(sections), gen});
   }
-  void addCodePage(const mkdefs::CpSource &src, bool firstGeneration = false);
+  void addCodePage(const mkdefs::CpSource &src);
   // The standard healthy set: English(1)/German(2), UnitedStates(840)/Germany(276),
   // US-ASCII-like 367, Latin1-like 819, a double-byte 932 and a shift-sensitive 930.
   static DefDir standard();
