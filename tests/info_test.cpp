@@ -129,15 +129,6 @@ TEST_F(Info, BuiltinLocaleValues) {
   VLReleaseLocale(l);
 }
 
-TEST_F(Info, FormsAgreeOnEveryTestPage) {
-  for (const char *name : {"German_Germany.Latin1", "English.MS932", "German_UnitedStates.IBM-930"}) {
-    VLLocale *l = open(name);
-    ASSERT_NE(l, nullptr) << name;
-    checkAllForms(l, name);
-    VLReleaseLocale(l);
-  }
-}
-
 // Every language with its defaults, every territory and every code page under the first
 // language.
 TEST_F(Info, FormsAgreeOnGeneratedDefinitions) {

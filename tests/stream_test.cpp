@@ -3,12 +3,10 @@
 #include <gtest/gtest.h>
 
 #include <fcntl.h>
-#include <iconv.h>
 #include <unistd.h>
 
 #include <cerrno>
 #include <cstring>
-#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <memory>
@@ -17,7 +15,7 @@
 #include <vector>
 
 #include "support/defdir.h"
-#include "support/hooks.h"
+#include "support/gendefs.h"
 
 namespace {
 
@@ -419,21 +417,10 @@ int32_t fdWrite(uint32_t fd, void *buf, int32_t n) {
 }
 
 TEST(StreamExample, AShiftSensitiveFileBackAsUtf16AgreesWithIconv) {
-  if (!std::filesystem::exists(std::string(VL_TEST_DEFS_DIR) + "/control.nls")) GTEST_SKIP();
+  if (!ts::haveDefs()) GTEST_SKIP();
   const std::string utf8 = "Tokyo \xE6\x9D\xB1\xE4\xBA\xAC, Osaka \xE5\xA4\xA7\xE9\x98\xAA\n2024\xE5\xB9\xB4\n";
-  auto conv = [](const char *to, const char *from, const std::string &in) {
-    iconv_t cd = iconv_open(to, from);
-    std::string out(in.size() * 4 + 16, '\0');
-    char *ip = const_cast<char *>(in.data()), *op = out.data();
-    size_t il = in.size(), ol = out.size();
-    iconv(cd, &ip, &il, &op, &ol);
-    iconv(cd, nullptr, nullptr, &op, &ol);
-    iconv_close(cd);
-    out.resize(out.size() - ol);
-    return out;
-  };
   ts::TempDir dir;
-  std::ofstream(dir.file("in.930"), std::ios::binary) << conv("IBM930", "UTF-8", utf8);
+  std::ofstream(dir.file("in.930"), std::ios::binary) << ts::iconvTo(utf8, "IBM930");
 
   ASSERT_EQ(VLInit(VL_TEST_DEFS_DIR, nullptr, nullptr, 0, 0), 0u);
   uint32_t rc;
@@ -461,7 +448,7 @@ TEST(StreamExample, AShiftSensitiveFileBackAsUtf16AgreesWithIconv) {
   close(out);
   std::ifstream back(dir.file("out.u16"), std::ios::binary);
   std::string got((std::istreambuf_iterator<char>(back)), {});
-  EXPECT_EQ(got, conv("UTF-16LE", "UTF-8", utf8));
+  EXPECT_EQ(got, ts::iconvTo(utf8, "UTF-16LE"));
   VLReleaseLocale(ebcdic);
   VLTerm();
 }
