@@ -139,13 +139,11 @@ TEST_F(Native, ReverseMapping) {
       {"German_UnitedStates.MS932", 16, nullptr},
   };
   for (const Case &c : cases) {
-    uint32_t rc = 0;
-    VLLocale *l = VLGetLocale(c.name, 0, &rc);
-    ASSERT_NE(l, nullptr) << c.name;
+    VLLocale *l = loc(c.name);
+    ASSERT_NE(l, nullptr);
     char out[16] = "unchanged";
     EXPECT_EQ(VLConvertLocale(l, out, c.size), c.native ? 1 : 0) << c.name;
     EXPECT_STREQ(out, c.native ? c.native : "unchanged") << c.name;
-    VLReleaseLocale(l);
   }
 }
 
@@ -210,8 +208,7 @@ bool NativeInfo::built_;
 
 TEST_F(NativeInfo, SameCodePageTakesSeparatorsAndTexts) {
   const std::string before = std::setlocale(LC_ALL, nullptr);
-  uint32_t rc = 0;
-  VLLocale *l = VLGetLocale("German_Germany.Latin1", 0, &rc);
+  VLLocale *l = loc("German_Germany.Latin1");
   ASSERT_NE(l, nullptr);
   VLMapNativeInfo("de_DE", l, 0);
   EXPECT_EQ(before, std::setlocale(LC_ALL, nullptr));
@@ -230,12 +227,10 @@ TEST_F(NativeInfo, SameCodePageTakesSeparatorsAndTexts) {
   if (!currency_.empty()) {
     EXPECT_EQ(text(l, 64), currency_);
   }
-  VLReleaseLocale(l);
 }
 
 TEST_F(NativeInfo, OtherCodePageKeepsSeparatorsAndTexts) {
-  uint32_t rc = 0;
-  VLLocale *l = VLGetLocale("English_UnitedStates.MS1252", 0, &rc);
+  VLLocale *l = loc("English_UnitedStates.MS1252");
   ASSERT_NE(l, nullptr);
   const uint8_t decimal = l->chars[2];
   const std::string currency = text(l, 64);
@@ -249,7 +244,6 @@ TEST_F(NativeInfo, OtherCodePageKeepsSeparatorsAndTexts) {
   l->num[1] = 9;
   VLMapNativeInfo("xx_NOWHERE", l, 0);
   EXPECT_EQ(l->num[1], 9);
-  VLReleaseLocale(l);
 }
 
 TEST_F(NativeInfo, UserLocaleFromThePlatformTakesItsConventions) {
