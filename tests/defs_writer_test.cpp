@@ -2,7 +2,6 @@
 // from small sources and read back through the library's load check and primitives.
 #include <gtest/gtest.h>
 
-#include <map>
 
 #include "container.h"
 #include "cpbuild.h"
@@ -206,37 +205,6 @@ TEST(DefsCodePage, DoubleByteReadsBackThroughTheLibrary) {
   // Thirty ideograph rows share their type records: without sharing they alone would
   // take 30 x 256 records.
   EXPECT_LT(cp.sections[0].size(), 9000u);
-}
-
-TEST(DefsCodePage, ShiftSensitive) {
-  CpSource s;
-  s.id = 9002;
-  s.name = "Shifted";
-  s.ascii = false;
-  s.shift = true;
-  s.maxLen = 2;
-  s.subst = 0x3F;
-  s.lenByLead.fill(1);
-  for (auto [b, u] : std::map<std::string, uint16_t>{{"\xC1", 'A'}, {"\x81", 'a'}, {"\x40", ' '}, {"\x42\xC1", 0xFF21},
-                                                      {"\x42\x81", 0xFF41}, {"\x40\x40", 0x3000}}) {
-    s.toUni[b] = u;
-    s.fromUni[u] = b;
-  }
-  CpSections cp;
-  std::string err;
-  ASSERT_TRUE(buildCodePage(s, ucd(), &cp, &err)) << err;
-  const Bytes &body = cp.sections[0];
-  EXPECT_EQ(body[8], 0x0E);
-  EXPECT_EQ(body[9], 0x0F);
-  EXPECT_EQ(be16(body, 4364), 0x0006);  // shift-sensitive, one-byte type records
-  cpmem::Loaded l(cp.sections, s.id);
-  ASSERT_EQ(l.rc, 0u);
-  const VLUChar in[] = {'A', 0xFF21, 0xFF41, 'a', 0x1234};
-  unsigned char out[16];
-  ASSERT_EQ(VLCpUnicodeToStr(l.cp(), in, 5, 0, out), 9);
-  EXPECT_EQ(Bytes(out, out + 9), (Bytes{0xC1, 0x0E, 0x42, 0xC1, 0x42, 0x81, 0x0F, 0x81, 0x3F}));
-  EXPECT_EQ(VLCpMbCaseConvW(l.cp(), 0x42C1, 0x002), 0x4281u);
-  EXPECT_EQ(VLCpMbHalfToFullW(l.cp(), 0xC1), 0x42C1u);
 }
 
 TEST(DefsCodePage, Utf8KeepsItsFixedTables) {
