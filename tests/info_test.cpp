@@ -104,10 +104,9 @@ class Info : public ::testing::Test {
     uint32_t rc;
     return VLGetLocale(name, 0, &rc);
   }
-  static ts::TempDir *dir_;
+  static inline ts::TempDir *dir_ = nullptr;
   std::unique_ptr<ts::Library> lib_;
 };
-ts::TempDir *Info::dir_;
 
 TEST_F(Info, BuiltinLocaleValues) {
   ts::TempDir empty;

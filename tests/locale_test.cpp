@@ -19,10 +19,9 @@ class Locale : public ::testing::Test {
     lib_.reset();
     EXPECT_EQ(ts::hooks.live, 0);
   }
-  static ts::TempDir *dir_;
+  static inline ts::TempDir *dir_ = nullptr;
   std::unique_ptr<ts::Library> lib_;
 };
-ts::TempDir *Locale::dir_;
 
 std::string describe(const VLLocale *l) {
   return std::string(l->language->name) + "_" + l->territory->name + "." + l->codePage->name + "@" +

@@ -197,14 +197,12 @@ class NativeInfo : public Native {
     VLGetLocaleTextInfo(l, item, b, sizeof b, 0);
     return b;
   }
-  static ts::TempDir *dir_;
-  static bool built_;
+  static inline ts::TempDir *dir_ = nullptr;
+  static inline bool built_ = false;
   std::unique_ptr<EnvScope> locpath_;
   lconv lc_;
   std::string decimal_, thousands_, currency_;
 };
-ts::TempDir *NativeInfo::dir_;
-bool NativeInfo::built_;
 
 TEST_F(NativeInfo, SameCodePageTakesSeparatorsAndTexts) {
   const std::string before = std::setlocale(LC_ALL, nullptr);

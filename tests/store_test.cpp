@@ -25,9 +25,8 @@ class Store : public ::testing::Test {
   static void TearDownTestSuite() { delete dir_; }
   // Every block the library took came back: also proves that nothing loaded twice.
   void TearDown() override { EXPECT_EQ(ts::hooks.live, 0); }
-  static ts::TempDir *dir_;
+  static inline ts::TempDir *dir_ = nullptr;
 };
-ts::TempDir *Store::dir_;
 
 TEST_F(Store, LookupsByNameAndId) {
   ts::Library lib(dir_->path.c_str());

@@ -97,13 +97,12 @@ class Stream : public ::testing::Test {
     }
     return out;
   }
-  static ts::TempDir *dir_;
+  static inline ts::TempDir *dir_ = nullptr;
   std::unique_ptr<ts::Library> lib_;
 
  public:
   VLLocale *ascii_ = nullptr, *dbcs_ = nullptr, *ebcdic_ = nullptr;
 };
-ts::TempDir *Stream::dir_;
 
 struct TextCase {
   const char *name;
