@@ -204,44 +204,36 @@ class NativeInfo : public Native {
   std::string decimal_, thousands_, currency_;
 };
 
-TEST_F(NativeInfo, SameCodePageTakesSeparatorsAndTexts) {
+// The platform's conventions are always taken; its separators and texts only into a handle
+// whose code page is the platform locale's own.
+TEST_F(NativeInfo, ConventionsAlwaysSeparatorsAndTextsInTheSameCodePage) {
   const std::string before = std::setlocale(LC_ALL, nullptr);
-  VLLocale *l = loc("German_Germany.Latin1");
-  ASSERT_NE(l, nullptr);
-  VLMapNativeInfo("de_DE", l, 0);
-  EXPECT_EQ(before, std::setlocale(LC_ALL, nullptr));
   ASSERT_EQ(decimal_.size(), 1u);
-  EXPECT_EQ(l->chars[2], static_cast<uint8_t>(decimal_[0]));
-  EXPECT_EQ(l->wchars[0], static_cast<uint8_t>(decimal_[0]));
-  if (thousands_.size() == 1) {
-    EXPECT_EQ(l->chars[3], static_cast<uint8_t>(thousands_[0]));
+  for (auto [name, same] : {std::pair{"German_Germany.Latin1", true}, {"English_UnitedStates.MS1252", false}}) {
+    SCOPED_TRACE(name);
+    VLLocale *l = loc(name);
+    ASSERT_NE(l, nullptr);
+    const uint8_t decimal = same ? static_cast<uint8_t>(decimal_[0]) : l->chars[2];
+    const std::string currency = same && !currency_.empty() ? currency_ : text(l, 64);
+    VLMapNativeInfo("de_DE", l, 0);
+    EXPECT_EQ(before, std::setlocale(LC_ALL, nullptr));
+    EXPECT_EQ(l->chars[2], decimal);
+    EXPECT_EQ(l->wchars[0], decimal);
+    if (same && thousands_.size() == 1) {
+      EXPECT_EQ(l->chars[3], static_cast<uint8_t>(thousands_[0]));
+    }
+    EXPECT_EQ(text(l, 64), currency);
+    EXPECT_EQ(l->num[1], lc_.frac_digits);
+    EXPECT_EQ(l->num[2], lc_.int_frac_digits);
+    EXPECT_EQ((l->flags & 0x1) != 0, lc_.p_cs_precedes != 0);
+    EXPECT_EQ((l->flags & 0x2) != 0, lc_.p_sep_by_space != 0);
+    EXPECT_EQ(l->chars[1], lc_.n_sign_posn);
+    EXPECT_EQ(text(l, 62), "3;3;0");
+    // A native name the platform does not know changes nothing.
+    l->num[1] = 9;
+    VLMapNativeInfo("xx_NOWHERE", l, 0);
+    EXPECT_EQ(l->num[1], 9);
   }
-  EXPECT_EQ(l->num[1], lc_.frac_digits);
-  EXPECT_EQ(l->num[2], lc_.int_frac_digits);
-  EXPECT_EQ((l->flags & 0x1) != 0, lc_.p_cs_precedes != 0);
-  EXPECT_EQ((l->flags & 0x2) != 0, lc_.p_sep_by_space != 0);
-  EXPECT_EQ(l->chars[1], lc_.n_sign_posn);
-  EXPECT_EQ(text(l, 62), "3;3;0");
-  if (!currency_.empty()) {
-    EXPECT_EQ(text(l, 64), currency_);
-  }
-}
-
-TEST_F(NativeInfo, OtherCodePageKeepsSeparatorsAndTexts) {
-  VLLocale *l = loc("English_UnitedStates.MS1252");
-  ASSERT_NE(l, nullptr);
-  const uint8_t decimal = l->chars[2];
-  const std::string currency = text(l, 64);
-  VLMapNativeInfo("de_DE", l, 0);
-  EXPECT_EQ(l->chars[2], decimal);
-  EXPECT_EQ(text(l, 64), currency);
-  EXPECT_EQ(l->num[1], lc_.frac_digits);
-  EXPECT_EQ((l->flags & 0x2) != 0, lc_.p_sep_by_space != 0);
-  EXPECT_EQ(text(l, 62), "3;3;0");
-  // A native name the platform does not know changes nothing.
-  l->num[1] = 9;
-  VLMapNativeInfo("xx_NOWHERE", l, 0);
-  EXPECT_EQ(l->num[1], 9);
 }
 
 TEST_F(NativeInfo, UserLocaleFromThePlatformTakesItsConventions) {
