@@ -10,6 +10,7 @@
 #include "codepage/cpbody.h"
 #include "frame/frame.h"
 #include "iconvcp.h"
+#include "support/defdir.h"
 #include "ucd.h"
 
 namespace {
@@ -32,15 +33,7 @@ class DefsGenerated : public ::testing::Test {
     ASSERT_EQ(rc_, 0u);
   }
   static VLObjManager *manager() { return vlglobals->objManager; }
-  static const UnicodeProps &ucd() {
-    static const UnicodeProps p = [] {
-      UnicodeProps u;
-      std::string err;
-      if (!loadUnicode("", &u, &err)) ADD_FAILURE() << err;
-      return u;
-    }();
-    return p;
-  }
+  static const UnicodeProps &ucd() { return ts::unicode(); }
   static inline bool up_ = false;
   static inline uint32_t rc_ = 0;
 };

@@ -7,6 +7,7 @@
 #include "cpbuild.h"
 #include "frame/frame.h"
 #include "support/cpmem.h"
+#include "support/defdir.h"
 #include "ucd.h"
 
 namespace {
@@ -16,15 +17,7 @@ using namespace mkdefs;
 uint16_t be16(const Bytes &b, size_t at) { return static_cast<uint16_t>(b.at(at) << 8 | b.at(at + 1)); }
 uint32_t be32(const Bytes &b, size_t at) { return static_cast<uint32_t>(be16(b, at)) << 16 | be16(b, at + 2); }
 
-const UnicodeProps &ucd() {
-  static const UnicodeProps p = [] {
-    UnicodeProps u;
-    std::string err;
-    if (!loadUnicode("", &u, &err)) ADD_FAILURE() << err;
-    return u;
-  }();
-  return p;
-}
+const UnicodeProps &ucd() { return ts::unicode(); }
 
 TEST(DefsContainer, HeaderAndSections) {
   Bytes f;
