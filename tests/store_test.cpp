@@ -83,6 +83,12 @@ TEST_F(Store, BrokenObjectFilesFallBack) {
     b[off + 1] = static_cast<uint8_t>(v);
   };
   const size_t body = 76;  // first section follows the header
+  // Rewrites the index entry of Unicode row 0: kind, mask, bounds and low-table offset.
+  auto row0 = [&](ts::Bytes &b, uint8_t kind, uint8_t mask, uint8_t lo, uint8_t hi, uint16_t low) {
+    const uint8_t head[] = {kind, mask, lo, hi};
+    std::copy(head, head + 4, b.begin() + body + vl::cp::kIndex);
+    at16(b, body + vl::cp::kIndex + 4, low);
+  };
   std::vector<Case> cases = {
       {"missing", 0, 2, nullptr, VL_RC_FILE_IO},
       {"bad magic", 0, 2, [](ts::Bytes &b) { b[0] ^= 0xFF; }, VL_RC_BADMAGIC},
@@ -98,22 +104,11 @@ TEST_F(Store, BrokenObjectFilesFallBack) {
          uint16_t size0 = static_cast<uint16_t>(b[10] << 8 | b[11]);
          at16(b, recs, static_cast<uint16_t>((size0 - 8) & ~3));
        }, VL_RC_BADMAGIC},
-      {"index entry past low table", 2, 819, [&](ts::Bytes &b) {
-         size_t e = body + vl::cp::kIndex + 8 * 0x00;
-         b[e + 1] = 0xFF;
-         b[e + 2] = 0;
-         b[e + 3] = 0xFF;
-         at16(b, e + 4, 0xFF00);
-       }, VL_RC_BADMAGIC},
+      {"index entry past low table", 2, 819,
+       [&](ts::Bytes &b) { row0(b, b[body + vl::cp::kIndex], 0xFF, 0, 0xFF, 0xFF00); }, VL_RC_BADMAGIC},
       // Writers size their output from the maximum length: no table may yield more.
-      {"index kind yields two bytes in a single-byte page", 2, 819, [&](ts::Bytes &b) {
-         size_t e = body + vl::cp::kIndex + 8 * 0x00;
-         b[e] = 1;
-         b[e + 1] = 0x3F;
-         b[e + 2] = 0x40;
-         b[e + 3] = 0x7F;
-         at16(b, e + 4, 0);
-       }, VL_RC_BADMAGIC},
+      {"index kind yields two bytes in a single-byte page", 2, 819,
+       [&](ts::Bytes &b) { row0(b, 1, 0x3F, 0x40, 0x7F, 0); }, VL_RC_BADMAGIC},
       {"a single-byte body under the UTF-8 id", 2, VL_CP_UTF8, nullptr, VL_RC_BADMAGIC},
   };
   for (const auto &c : cases) {
