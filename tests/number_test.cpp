@@ -7,6 +7,7 @@
 #include <cmath>
 #include <cstdlib>
 #include <cstring>
+#include <fstream>
 #include <functional>
 #include <memory>
 #include <monetary.h>
@@ -658,11 +659,9 @@ TEST_F(NumNative, CurrencyAgreesWithStrfmon) {
 
 std::string run(const std::string &args, const std::string &input = "", int *status = nullptr) {
   ts::TempDir d;
-  std::string in = d.file("in");
-  FILE *f = std::fopen(in.c_str(), "w");
-  std::fputs(input.c_str(), f);
-  std::fclose(f);
-  std::string cmd = std::string(VL_TEST_TLX) + " " + args + " --dir " + VL_TEST_DEFS_DIR + " <" + in + " 2>&1";
+  std::ofstream(d.file("in")) << input;
+  const std::string cmd =
+      std::string(VL_TEST_TLX) + " " + args + " --dir " + VL_TEST_DEFS_DIR + " <" + d.file("in") + " 2>&1";
   FILE *p = popen(cmd.c_str(), "r");
   std::string out;
   char b[256];
