@@ -180,6 +180,13 @@ uint32_t serviceLocale(uint32_t language, uint32_t territory, uint32_t page) {
   if (l) VLReleaseLocale(l);
   return l ? 0 : rc;
 }
+uint32_t translate(Ctx &) {
+  char out[8] = "";
+  int32_t count = 0;
+  uint32_t rc = 0;
+  int32_t n = NLS1_TranslateString(273, out, sizeof out, 500, "\xC1\x5A", 2, &count, 0, &rc);
+  return n < 0 ? rc : n == 2 && !std::memcmp(out, "\xC1\xFC", 2) ? 0 : 99;
+}
 uint16_t idOf(uint16_t type, const char *name) {
   uint32_t rc = 0;
   VLObjEntry *e = VLGetObjFromName(vlglobals->objManager, type, name, int32_t(std::strlen(name)), 1, &rc);
@@ -331,6 +338,27 @@ const Row kRows[] = {
      [](Ctx &c) { return VLSetLocaleTextInfoEx(c.other, 64, "YEN", 0, 3, 0) ? 0 : err(c.other); }, bothUsable},
     {"VLSetLocaleNumInfo", loadBoth, [](Ctx &c) { return VLSetLocaleNumInfo(c.l, 1, 3, 0) ? 0 : err(c.l); },
      bothUsable},
+    // The name's text on an EBCDIC page needs the ASCII page, loaded when first asked for.
+    {"VLGetLocaleTextInfo, right or refused", loadBoth,
+     [](Ctx &c) {
+       char buf[64] = "";
+       int32_t n = VLGetLocaleTextInfo(c.other, VL_ITEM_LOCALE, buf, sizeof buf, 0);
+       c.path = buf;
+       return n > 0 ? 0 : err(c.other);
+     },
+     [](Ctx &c) {
+       char buf[64] = "";
+       VLGetLocaleTextInfo(c.other, VL_ITEM_LOCALE, buf, sizeof buf, 0);
+       return bothUsable(c) && (c.path.empty() || c.path == buf);
+     },
+     nullptr, {0, VL_RC_NOMEM}},
+    {"VLComStrToUnicode", none,
+     [](Ctx &) {
+       VLUChar u[8];
+       return VLComStrToUnicode(reinterpret_cast<const unsigned char *>("abc"), 3, u) == 3 ? 0u : 20u;
+     },
+     libraryUsable},
+    // Conversion and streams.
     {"VLOpenConversion", loadBoth,
      [](Ctx &c) {
        c.conv = VLOpenConversion(c.other, c.l);
@@ -484,14 +512,12 @@ const Row kRows[] = {
        return NLS1_SetLocaleTextInfo(nullptr, 64, "EUR", 3, 0) ? 0 : err(NLS1_PrivateFunction_GetThreadLocale());
      },
      threadUsable, dropThreadLocale},
-    {"NLS1_TranslateString between two pages not yet loaded", withService,
-     [](Ctx &) {
-       char out[64];
-       int32_t count = 0;
-       uint32_t rc = 0;
-       return NLS1_TranslateString(273, out, sizeof out, 500, "\xC1\xC2", 2, &count, 0, &rc) == 2 ? 0 : rc;
-     },
-     threadUsable, dropThreadLocale},
+    // Starting the service builds the process's and the thread's locales: what fails
+    // there must not keep the thread without one, nor stop the translation.
+    {"NLS1_TranslateString starting the service", loadBoth, translate, threadUsable, dropThreadLocale,
+     {0, VL_RC_NOMEM}},
+    {"NLS1_TranslateString between two pages not yet loaded", withService, translate, threadUsable,
+     dropThreadLocale},
 };
 
 void PrintTo(const Row &row, std::ostream *os) { *os << row.name; }
