@@ -384,6 +384,23 @@ const Row kRows[] = {
     {"VLStrcmp without regard to case, on the mapped path", loadBoth,
      [](Ctx &c) { return VLStrcmp(c.l, "Stra\xDF" "e", -1, "STRASSE", -1, VL_CMP_NOCASE) == 0 ? err(c.l) : 99u; },
      bothUsable},
+    {"VLStrcmp ignoring trailing blanks", loadBoth,
+     [](Ctx &c) { return VLStrcmp(c.l, "abc   ", -1, "abc", -1, VL_CMP_NOBLANKS) == 0 ? err(c.l) : 99u; },
+     bothUsable},
+    {"VLStrcmpU without regard to case, on the mapped path", loadBoth,
+     [](Ctx &c) {
+       auto a = wide<VLUChar>("Stra\xDF" "e"), b = wide<VLUChar>("STRASSE");
+       a[4] = 0xDF;
+       return VLStrcmpU(c.l, a.data(), -1, b.data(), -1, VL_CMP_NOCASE) == 0 ? err(c.l) : 99u;
+     },
+     bothUsable},
+    {"VLWcscmp without regard to case, on the mapped path", loadBoth,
+     [](Ctx &c) {
+       auto a = wide<VLWChar>("Stra\xDF" "e"), b = wide<VLWChar>("STRASSE");
+       a[4] = 0xDF;
+       return VLWcscmp(c.l, a.data(), -1, b.data(), -1, VL_CMP_NOCASE) == 0 ? err(c.l) : 99u;
+     },
+     bothUsable},
     {"VLStrcmpEx without regard to case, on a shift page", loadBoth,
      [](Ctx &c) { return VLStrcmpEx(c.other, kLong.c_str(), 0, -1, kLong.c_str(), 0, -1, VL_CMP_NOCASE) ? 99u : err(c.other); },
      bothUsable},
