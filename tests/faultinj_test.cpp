@@ -238,6 +238,32 @@ const Row kRows[] = {
      },
      [](Ctx &) { return vlglobals || VLInit(noAliasDir().c_str(), ts::countingAlloc, ts::countingFree, 0, 0) == 0; },
      nullptr, {VL_RC_NOMEM, VL_RC_NOMANAGER}},
+    {"VLInit on the built-in definitions", none,
+     [](Ctx &) {
+       VLTerm();
+       uint32_t rc = VLInit("/nonexistent", ts::countingAlloc, ts::countingFree, 0, 0);
+       return rc == VL_RC_DEFAULTS ? 0 : rc;
+     },
+     [](Ctx &) { return vlglobals || VLInit(VL_TEST_DEFS_DIR, ts::countingAlloc, ts::countingFree, 0, 0) == 0; },
+     nullptr, {VL_RC_NOMEM, VL_RC_NOMANAGER}},
+    {"VLOpenFile and VLLoadFile", none,
+     [](Ctx &c) {
+       uint32_t rc = 0;
+       c.file = VLOpenFile(1, (std::string(VL_TEST_DEFS_DIR) + "/control.nls").c_str(), VL_FILE_READ, 0, &rc);
+       c.block = c.file ? VLLoadFile(c.file, 0, 64, &rc) : nullptr;
+       return c.block ? 0 : rc;
+     },
+     libraryUsable, [](Ctx &c) { VLUnloadFile(c.block); }},
+    {"VLLoadObj of an entry found unloaded",
+     [](Ctx &c) {
+       uint32_t rc = 0;
+       c.entry = VLGetObjFromName(vlglobals->objManager, VL_OBJ_CODEPAGE, "MS1250", 6, 1, &rc);
+     },
+     [](Ctx &c) {
+       uint32_t rc = 0;
+       return VLLoadObj(vlglobals->objManager, c.entry, &rc) ? 0 : rc;
+     },
+     [](Ctx &) { return getLocale("Polish_Poland.MS1250") == 0; }},
     {"VLGetObjFromName loading a code page", none,
      [](Ctx &) {
        uint32_t rc = 0;
