@@ -33,12 +33,14 @@ struct Ctx {
   VLFile *file = nullptr;
   void *block = nullptr;
   std::string path;
+  uint32_t rc = 0;
 };
 
-// The text widened unit by unit, 0 included.
+// The bytes widened unit by unit, 0 included.
 template <class T>
 std::vector<T> wide(const std::string &s) {
-  return std::vector<T>(s.c_str(), s.c_str() + s.size() + 1);
+  auto *p = reinterpret_cast<const unsigned char *>(s.c_str());
+  return std::vector<T>(p, p + s.size() + 1);
 }
 
 uint32_t err(VLLocale *l) { return uint32_t(VLGetError(l)); }
@@ -110,7 +112,7 @@ void loadBoth(Ctx &c) {
   c.other = locale("Japanese_Japan.IBM930");
 }
 bool bothUsable(Ctx &c) { return usable(c.l) && usable(c.other); }
-bool libraryUsable(Ctx &) { return usable(vlglocale ? vlglocale : nullptr) || getLocale("German") == 0; }
+bool libraryUsable(Ctx &) { return usable(vlglocale) || getLocale("German") == 0; }
 
 // After a failed first load, the same name must still give a handle.
 bool loadsAgain(const char *name) { return getLocale(name) == 0; }
@@ -193,6 +195,9 @@ uint16_t idOf(uint16_t type, const char *name) {
   return e ? e->id : 0;
 }
 
+// The code of a call that finds an object, read once the call is done.
+uint32_t found(VLObjEntry *e, const uint32_t &rc) { return e ? 0 : rc; }
+
 // The code of a call that gives a handle, read once the call is done.
 uint32_t released(VLLocale *l, const uint32_t &rc) {
   if (l) VLReleaseLocale(l);
@@ -202,7 +207,6 @@ uint32_t released(VLLocale *l, const uint32_t &rc) {
 const std::string kLong(3000, 'a');
 const std::string kLongA = kLong + "\xE4";
 
-// Counts the names that arrive, and those that arrive empty.
 // "Straße" against "STRASSE" without regard to case: equal, through special casing.
 template <class T, class Fn>
 uint32_t mappedWide(Ctx &c, Fn fn) {
@@ -224,6 +228,7 @@ uint32_t xfrmWide(Ctx &c, Fn fn) {
   return fn(c.l, key.data(), int32_t(key.size()), a.data(), -1, 0) > 0 ? 0 : err(c.l);
 }
 
+// Counts the names that arrive, and those that arrive empty.
 int enumCount(void *n, int, const VLUChar *name) {
   ++static_cast<int *>(n)[*name ? 0 : 1];
   return 1;
@@ -259,29 +264,19 @@ const Row kRows[] = {
        uint32_t rc = 0;
        c.entry = VLGetObjFromName(vlglobals->objManager, VL_OBJ_CODEPAGE, "MS1250", 6, 1, &rc);
      },
-     [](Ctx &c) {
-       uint32_t rc = 0;
-       return VLLoadObj(vlglobals->objManager, c.entry, &rc) ? 0 : rc;
-     },
+     [](Ctx &c) { return found(VLLoadObj(vlglobals->objManager, c.entry, &c.rc), c.rc); },
      [](Ctx &) { return getLocale("Polish_Poland.MS1250") == 0; }},
     {"VLGetObjFromName loading a code page", none,
-     [](Ctx &) {
-       uint32_t rc = 0;
-       return VLGetObjFromName(vlglobals->objManager, 2, "IBM930", 6, 0, &rc) ? 0 : rc;
-     },
+     [](Ctx &c) { return found(VLGetObjFromName(vlglobals->objManager, 2, "IBM930", 6, 0, &c.rc), c.rc); },
      [](Ctx &) { return object(2, "IBM930") != nullptr; }},
     {"VLGetObjFromNameW loading a sort", none,
-     [](Ctx &) {
-       const VLWChar name[] = {'S', 'w', 'e', 'd', 'i', 's', 'h', 0};
-       uint32_t rc = 0;
-       return VLGetObjFromNameW(vlglobals->objManager, VL_OBJ_SORT, name, 7, 0, &rc) ? 0u : rc;
+     [](Ctx &c) {
+       return found(VLGetObjFromNameW(vlglobals->objManager, VL_OBJ_SORT, wide<VLWChar>("Swedish").data(), 7, 0, &c.rc),
+                    c.rc);
      },
      [](Ctx &) { return object(VL_OBJ_SORT, "Swedish") != nullptr; }},
     {"VLGetObjFromID loading a language", none,
-     [](Ctx &) {
-       uint32_t rc = 0;
-       return VLGetObjFromID(vlglobals->objManager, 0, idOf(0, "German"), 0, &rc) ? 0u : rc;
-     },
+     [](Ctx &c) { return found(VLGetObjFromID(vlglobals->objManager, 0, idOf(0, "German"), 0, &c.rc), c.rc); },
      [](Ctx &) { return object(0, "German") != nullptr; }},
     {"VLBuildAliasList", none,
      [](Ctx &) {
