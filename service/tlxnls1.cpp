@@ -38,14 +38,19 @@ void TermProcess(void *) { VLTerm(); }
 
 OSL1_Descriptor gProcess = {sizeof(int32_t), InitProcess, TermProcess, nullptr, {}, PTHREAD_ONCE_INIT, {0}};
 
-void InitThread(void *block) {
-  auto *slot = static_cast<VLLocale **>(block);
-  *slot = nullptr;
-  auto *proc = static_cast<int32_t *>(OSL1_ResolveProcess(&gProcess, "tlxnls1", __LINE__));
-  if (!proc || *proc != 0) return;
+// Builds the thread's handle once the library runs, whether or not the process default
+// could be set; a slot left empty (memory ran out) is filled on a later use.
+void fillThreadSlot(VLLocale **slot) {
+  if (*slot || tlxinflg.load() <= 0) return;
   uint32_t rc = 0;
   *slot = VLGetLocale(nullptr, VL_LOCALE_USER | VL_LOCALE_FALLBACK, &rc);
   if (!*slot) VL_ERR("Unable to set thread locale, rc = %d", static_cast<int>(rc));
+}
+
+void InitThread(void *block) {
+  auto *slot = static_cast<VLLocale **>(block);
+  *slot = nullptr;
+  if (OSL1_ResolveProcess(&gProcess, "tlxnls1", __LINE__)) fillThreadSlot(slot);
 }
 
 void TermThread(void *block) {
@@ -147,6 +152,7 @@ int32_t NLS1_PrivateFunction_GetProcessLocale(void) {
 VLLocale *NLS1_PrivateFunction_GetThreadLocale(void) {
   VL_FLOW("NLS1_PrivateFunction_GetThreadLocale");
   VLLocale **slot = vl::svc::threadSlot();
+  if (slot) fillThreadSlot(slot);
   VL_RET(slot ? *slot : static_cast<VLLocale *>(nullptr));
 }
 

@@ -175,12 +175,13 @@ uint32_t byteLength(F f, const uint8_t *s, int32_t len, bool chars) {
 }
 
 // Trailing blanks dropped through truncation of a scratch copy; the caller's bytes are
-// compared with the shorter length. Without a scratch block the blanks simply stay.
+// compared with the shorter length. False without a scratch block: the caller cannot
+// compare as asked.
 template <class F>
-void dropBlanks(VLLocale *l, F f1, const uint8_t *s1, uint32_t *n1, F f2, const uint8_t *s2, uint32_t *n2,
+bool dropBlanks(VLLocale *l, F f1, const uint8_t *s1, uint32_t *n1, F f2, const uint8_t *s2, uint32_t *n2,
                 bool width) {
   Block<char> buf(size_t{std::max(*n1, *n2)} + 1);
-  if (!buf) return;
+  if (!buf) return false;
   const uint32_t opts = kTrimBlanks | (width ? kFoldWidth : 0);
   auto one = [&](F f, const uint8_t *s, uint32_t *n) {
     if (*n) std::memcpy(buf.get(), s, *n);
@@ -196,6 +197,7 @@ void dropBlanks(VLLocale *l, F f1, const uint8_t *s1, uint32_t *n1, F f2, const 
   };
   one(f1, s1, n1);
   one(f2, s2, n2);
+  return true;
 }
 
 // One character folded to upper case into four zeroed bytes.
@@ -303,7 +305,10 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
   const bool chars = (opts & VL_OPT_CHARLEN) != 0;
   const Mode mode = modeOf(opts);
   uint32_t n1 = byteLength(f1, s1, len1, chars), n2 = byteLength(f2, s2, len2, chars);
-  if ((opts & kCmpBlanks) && (n1 || n2)) dropBlanks(l, f1, s1, &n1, f2, s2, &n2, mode == Mode::Width);
+  if ((opts & kCmpBlanks) && (n1 || n2) && !dropBlanks(l, f1, s1, &n1, f2, s2, &n2, mode == Mode::Width)) {
+    setRc(l, VL_RC_NOMEM);
+    return 0;
+  }
   if constexpr (F::kShift) {
     for (auto [f, s, n] : {std::tuple{&f1, &s1, &n1}, std::tuple{&f2, &s2, &n2}})
       if (*n && f->isShift(**s)) {

@@ -45,8 +45,10 @@ const U<F> *find(VLLocale *l, F f, const U<F> *str, int32_t len, F sf, const U<F
       continue;
     }
     const uint32_t span = at + m <= n ? m : n - at;
-    if (coll::coll(l, here, str + at, static_cast<int32_t>(span), sf, sub, static_cast<int32_t>(m), opts) == 0)
-      return str + at;
+    const int r = coll::coll(l, here, str + at, static_cast<int32_t>(span), sf, sub, static_cast<int32_t>(m), opts);
+    // A comparison that found no work area answers 0 without having compared.
+    if (static_cast<uint32_t>(l->lastError) == VL_RC_NOMEM) return nullptr;
+    if (r == 0) return str + at;
   }
 }
 

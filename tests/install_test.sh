@@ -25,5 +25,22 @@ cmake -S "$src/tests/consumer" -B "$work/cm" -DCMAKE_PREFIX_PATH="$root" >"$work
 cmake --build "$work/cm" >>"$work/cmake.log"
 "$work/cm/consumer"
 
-"$root/bin/tlx" locale German_Germany.Latin1 >/dev/null
-echo "install: 3 passed, 0 failed"
+# The installed tool and library know nothing of the build: no path of its definitions
+# inside them, and with no VL_LOCALEDIR only the built-in location counts, though the
+# build's definitions are still there.
+built=$(cd "$build" && pwd)/locale
+for f in "$root/bin/tlx" "$lib"; do
+  if grep -aqF "$built" "$f"; then echo "$f names the build's definitions $built"; exit 1; fi
+done
+if [ ! -e /Tavrel/locale ]; then
+  env -u VL_LOCALEDIR "$root/bin/tlx" locale German_Germany.Latin1 | grep -q "no definitions found" ||
+    { echo "installed tlx found definitions it was not given"; exit 1; }
+fi
+# With the build's definitions hidden (where a mount namespace is to be had), the
+# installed tool finds the installed ones.
+mkdir "$work/empty"
+hide=()
+unshare -rm true 2>/dev/null && hide=(unshare -rm bash -c 'mount --bind "$0" "$1" && shift && exec "$@"' "$work/empty" "$built")
+"${hide[@]}" "$root/bin/tlx" locale German_Germany.Latin1 | grep -q "^language *German" ||
+  { echo "installed tlx did not find the installed definitions"; exit 1; }
+echo "install: 5 passed, 0 failed"

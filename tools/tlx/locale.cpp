@@ -1,24 +1,10 @@
 // tlx locale NAME [--dir DIR]: builds a locale and prints its parts.
 #include <cstdio>
-#include <cstdlib>
 #include <cstring>
 #include <string>
-#include <sys/stat.h>
 
 #include "tools/tlx/tlx.h"
 #include "veltrin.h"
-
-#ifndef VL_DEFAULT_DEFS
-#define VL_DEFAULT_DEFS ""
-#endif
-
-const char *defsDir(const char *given) {
-  if (given) return given;
-  if (const char *env = std::getenv("VL_LOCALEDIR")) return env;
-  struct stat st;
-  if (*VL_DEFAULT_DEFS && stat(VL_DEFAULT_DEFS, &st) == 0) return VL_DEFAULT_DEFS;
-  return nullptr;
-}
 
 namespace {
 const char *entryName(const VLObjEntry *e, const char *none) { return e ? e->name : none; }

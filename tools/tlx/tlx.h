@@ -17,7 +17,8 @@ int cmdParse(int argc, char **argv);
 int cmdMap(int argc, char **argv);
 int cmdSort(int argc, char **argv);
 
-// The definitions directory: --dir, else VL_LOCALEDIR, else the one built beside the tool.
+// The definitions directory: --dir, else VL_LOCALEDIR, else the build's own (build-tree tool
+// only), else null: the library's built-in location.
 const char *defsDir(const char *given);
 
 // UTF-16 for the terminal: UTF-8 when it takes UTF-8, else ASCII with \u escapes.
