@@ -53,7 +53,9 @@ Fixture &fixture() {
   return f;
 }
 
-void ours(benchmark::State &state, uint32_t mode) {
+// pointer: the pointer a loaded catalog hands out (MCGetSet, MCGetMsg), the same work as
+// catgets; else VLGetMessage's copy into the caller's buffer.
+void ours(benchmark::State &state, uint32_t mode, bool pointer) {
   Fixture &f = fixture();
   uint32_t rc;
   VLLocale *l = VLGetLocale("English_UnitedStates.UTF-8", 0, &rc);
@@ -64,34 +66,17 @@ void ours(benchmark::State &state, uint32_t mode) {
     return;
   }
   char buf[128];
-  size_t i = 0;
-  for (auto _ : state) {
-    const auto &k = f.keys[i++ & 4095];
-    benchmark::DoNotOptimize(VLGetMessage(c, static_cast<uint32_t>(k.first), static_cast<uint32_t>(k.second), buf,
-                                          sizeof buf, nullptr, 0));
-  }
-  state.SetItemsProcessed(static_cast<int64_t>(state.iterations()));
-  VLCloseCatalog(c);
-  VLReleaseLocale(l);
-}
-
-// The pointer a loaded catalog hands out (MCGetSet, MCGetMsg): the same work as catgets.
-void oursPointer(benchmark::State &state) {
-  Fixture &f = fixture();
-  uint32_t rc;
-  VLLocale *l = VLGetLocale("English_UnitedStates.UTF-8", 0, &rc);
-  VLCatalog *c = f.ok && l ? VLOpenCatalog(l, nullptr, (f.dir + "/ours.cat").c_str(), VL_CAT_INMEMORY) : nullptr;
-  if (!c) {
-    state.SkipWithError("catalog not built");
-    if (l) VLReleaseLocale(l);
-    return;
-  }
-  size_t i = 0;
   VLMcSet rec;
+  size_t i = 0;
   for (auto _ : state) {
     const auto &k = f.keys[i++ & 4095];
-    VLMcSet *s = MCGetSet(c, static_cast<uint32_t>(k.first), &rec);
-    benchmark::DoNotOptimize(s ? MCGetMsg(c, s, static_cast<uint32_t>(k.second)) : nullptr);
+    const auto set = static_cast<uint32_t>(k.first), msg = static_cast<uint32_t>(k.second);
+    if (pointer) {
+      VLMcSet *s = MCGetSet(c, set, &rec);
+      benchmark::DoNotOptimize(s ? MCGetMsg(c, s, msg) : nullptr);
+    } else {
+      benchmark::DoNotOptimize(VLGetMessage(c, set, msg, buf, sizeof buf, nullptr, 0));
+    }
   }
   state.SetItemsProcessed(static_cast<int64_t>(state.iterations()));
   VLCloseCatalog(c);
@@ -123,9 +108,9 @@ void catgetsLookup(benchmark::State &state, bool copy) {
   catclose(d);
 }
 
-BENCHMARK_CAPTURE(ours, CatalogLookup/memory, VL_CAT_INMEMORY);
-BENCHMARK_CAPTURE(ours, CatalogLookup/file, 0u);
-BENCHMARK(oursPointer)->Name("ours/CatalogLookup/memory+pointer");
+BENCHMARK_CAPTURE(ours, CatalogLookup/memory, VL_CAT_INMEMORY, false);
+BENCHMARK_CAPTURE(ours, CatalogLookup/file, 0u, false);
+BENCHMARK_CAPTURE(ours, CatalogLookup/memory+pointer, VL_CAT_INMEMORY, true);
 BENCHMARK_CAPTURE(catgetsLookup, CatalogLookup/catgets, false);
 BENCHMARK_CAPTURE(catgetsLookup, CatalogLookup/catgets+copy, true);
 
