@@ -76,11 +76,13 @@ inline bool startsKey(const map::Special &sp, VLUChar u) {
 // The language's upper-case special keys, filtered by first unit, and per one-byte value
 // its folded form with flags: kKey when it starts a key, kNul for the 0 that may end a
 // string. The common case (equal folds, no flag) then costs one table read a side.
-constexpr uint16_t kKey = 0x100, kNul = 0x200;
+// ufold does the same for UTF-16 units below 256, kSlow marking the two whose upper case
+// lies above.
+constexpr uint16_t kKey = 0x100, kNul = 0x200, kSlow = 0x400;
 struct Keys {
   map::Special sp{nullptr, 44};
   bool special = false;  // the language's flag
-  uint16_t fold[256] = {};
+  uint16_t fold[256] = {}, ufold[256] = {};
   bool byte(uint32_t v) const { return (fold[v] & kKey) != 0; }
 };
 
@@ -101,9 +103,14 @@ inline const Keys &upperKeys(const VLLocale *l) {
     c.k.special = specialCasing(l);
     c.k.sp = map::Special(c.k.special ? lang : nullptr, 44);
     const uint8_t *t = foldTable(l);
-    for (uint32_t v = 0; v < 256; ++v)
+    for (uint32_t v = 0; v < 256; ++v) {
+      const uint16_t nul = v ? 0 : kNul;
       c.k.fold[v] = static_cast<uint16_t>(
-          t[v] | (startsKey(c.k.sp, cp::sbcsUni(l->codePage, static_cast<uint8_t>(v))) ? kKey : 0) | (v ? 0 : kNul));
+          t[v] | (startsKey(c.k.sp, cp::sbcsUni(l->codePage, static_cast<uint8_t>(v))) ? kKey : 0) | nul);
+      const VLUChar up = umap::toUpper(static_cast<VLUChar>(v));
+      const bool key = startsKey(c.k.sp, static_cast<VLUChar>(v));
+      c.k.ufold[v] = static_cast<uint16_t>((up < 256 ? up : kSlow) | (key ? kKey : 0) | nul);
+    }
     c.lang = lang, c.page = l->codePage, c.body = b, c.unloads = gen;
   }
   return c.k;
@@ -399,9 +406,11 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
 // must then upper-case as map does without the table. Units after the first difference
 // cannot change the sign: each maps to at least one unit, and the prefix before it maps
 // alike in both strings. Terminators of negative lengths are found on the way.
+// low, when given, holds for units below 256 what fold gives them with the flags of Keys;
+// pairs that fold alike without a flag then cost two table reads.
 template <class T, class Fold, class Map, class IsKey>
 int32_t compareUnits(VLLocale *l, const T *s1, int32_t len1, const T *s2, int32_t len2, bool blanks, T blank,
-                     const Keys *keys, bool signOnly, Fold fold, Map map, IsKey isKey) {
+                     const Keys *keys, const uint16_t *low, bool signOnly, Fold fold, Map map, IsKey isKey) {
   if (blanks || !s1 || !s2) {  // the ends are needed first
     uint32_t n1 = s1 ? resolveLen(s1, len1) : 0, n2 = s2 ? resolveLen(s2, len2) : 0;
     if (blanks) {
@@ -419,6 +428,7 @@ int32_t compareUnits(VLLocale *l, const T *s1, int32_t len1, const T *s2, int32_
   uint32_t i = 0;
   for (; i < n; ++i) {
     const uint32_t a = s1[i], b = s2[i];
+    if (low && (a | b) < 256 && low[a] == low[b] && !(low[a] & (kKey | kNul | kSlow))) continue;
     if (!(a && b) && ((!a && z1) || (!b && z2))) break;
     if (special && (isKey(*keys, a) || (a != b && isKey(*keys, b))))  // a unit may become two
       return compareMapped<T>(l, s1, z1 ? length(s1) : m1, s2, z2 ? length(s2) : m2, 2 * sizeof(T), true, true,

@@ -24,7 +24,8 @@ int32_t VLWcscmp(VLLocale *locale, const VLWChar *str1, int32_t len1, const VLWC
     return VLMapStringW(l, out, cap, in, static_cast<int32_t>(n), sel);
   };
   const VLWChar blank = vl::cp::isAscii(c) ? 0x20 : 0x40;
-  VL_RET(compareUnits<VLWChar>(l, str1, len1, str2, len2, (options & kCmpBlanks) != 0, blank, keys, false, fold,
+  VL_RET(compareUnits<VLWChar>(l, str1, len1, str2, len2, (options & kCmpBlanks) != 0, blank, keys,
+                               keys ? keys->fold : nullptr, false, fold,
                                map, [&page](const Keys &k, VLWChar v) {
                                  return v <= 0xFF ? k.byte(v) : startsKey(k.sp, page.toUni(v));
                                }));
