@@ -1,8 +1,9 @@
 // Message lookup in a catalog of 10,000 messages (10 sets of 1,000): this library in file
 // mode and in memory mode against the C library's catgets on a catalog its gencat compiled
 // from the same source, in the same run. Every lookup goes to a pseudo-random message;
-// ours copies the text into the caller's buffer (converted, here UTF-8 to UTF-8), catgets
-// hands out a pointer.
+// VLGetMessage copies the text into the caller's buffer (converted, here UTF-8 to UTF-8),
+// catgets hands out a pointer, as MCGetMsg does for a loaded catalog; each is also run
+// the other way (catgets with a copy, MCGetMsg without).
 #include <benchmark/benchmark.h>
 #include <nl_types.h>
 
@@ -52,7 +53,9 @@ Fixture &fixture() {
   return f;
 }
 
-void ours(benchmark::State &state, uint32_t mode) {
+// pointer: the pointer a loaded catalog hands out (MCGetSet, MCGetMsg), the same work as
+// catgets; else VLGetMessage's copy into the caller's buffer.
+void ours(benchmark::State &state, uint32_t mode, bool pointer) {
   Fixture &f = fixture();
   uint32_t rc;
   VLLocale *l = VLGetLocale("English_UnitedStates.UTF-8", 0, &rc);
@@ -63,11 +66,17 @@ void ours(benchmark::State &state, uint32_t mode) {
     return;
   }
   char buf[128];
+  VLMcSet rec;
   size_t i = 0;
   for (auto _ : state) {
     const auto &k = f.keys[i++ & 4095];
-    benchmark::DoNotOptimize(VLGetMessage(c, static_cast<uint32_t>(k.first), static_cast<uint32_t>(k.second), buf,
-                                          sizeof buf, nullptr, 0));
+    const auto set = static_cast<uint32_t>(k.first), msg = static_cast<uint32_t>(k.second);
+    if (pointer) {
+      VLMcSet *s = MCGetSet(c, set, &rec);
+      benchmark::DoNotOptimize(s ? MCGetMsg(c, s, msg) : nullptr);
+    } else {
+      benchmark::DoNotOptimize(VLGetMessage(c, set, msg, buf, sizeof buf, nullptr, 0));
+    }
   }
   state.SetItemsProcessed(static_cast<int64_t>(state.iterations()));
   VLCloseCatalog(c);
@@ -99,8 +108,9 @@ void catgetsLookup(benchmark::State &state, bool copy) {
   catclose(d);
 }
 
-BENCHMARK_CAPTURE(ours, CatalogLookup/memory, VL_CAT_INMEMORY);
-BENCHMARK_CAPTURE(ours, CatalogLookup/file, 0u);
+BENCHMARK_CAPTURE(ours, CatalogLookup/memory, VL_CAT_INMEMORY, false);
+BENCHMARK_CAPTURE(ours, CatalogLookup/file, 0u, false);
+BENCHMARK_CAPTURE(ours, CatalogLookup/memory+pointer, VL_CAT_INMEMORY, true);
 BENCHMARK_CAPTURE(catgetsLookup, CatalogLookup/catgets, false);
 BENCHMARK_CAPTURE(catgetsLookup, CatalogLookup/catgets+copy, true);
 

@@ -101,6 +101,30 @@ inline void dispose(VLCatalog *c) {
   release(c);
 }
 
+// The default text cut to fit length bytes with its 0. In a shift-sensitive page the cut
+// is truncation's, which closes a double-byte run it ends in; that works on a scratch copy
+// (false when it cannot be had).
+inline bool copyDefault(VLLocale *l, char *buffer, int32_t length, const char *text) {
+  const size_t n = std::strlen(text);
+  if (n < static_cast<size_t>(length)) {
+    std::memcpy(buffer, text, n + 1);
+    return true;
+  }
+  if (!step::isShifted(l)) {
+    const int32_t k = VLStrcpy(l, buffer, length - 1, text, static_cast<int32_t>(n), 0);
+    buffer[k > 0 ? k : 0] = 0;
+    return true;
+  }
+  buffer[0] = 0;
+  Block<char> scratch(static_cast<size_t>(length) + 1);
+  if (!scratch) return false;
+  std::memcpy(scratch.get(), text, static_cast<size_t>(length));
+  scratch.get()[length] = 0;
+  const int32_t k = VLTruncateStringEx(l, scratch.get(), 0, length, 0);
+  if (k > 0) std::memcpy(buffer, scratch.get(), static_cast<size_t>(k));
+  return true;
+}
+
 // ---- The W and UTF-16 members: through the caller's code page ---------------------------
 
 // A unit takes at most four bytes in any code page, plus a shift byte.

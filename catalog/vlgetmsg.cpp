@@ -44,8 +44,7 @@ uint32_t VLGetMessage(VLCatalog *catalog, uint32_t set, uint32_t message, char *
   // A damaged catalog keeps its code in the handle even when a default stands in.
   const uint32_t rc = static_cast<uint32_t>(l->lastError);
   if (defaultText) {
-    int32_t n = VLStrcpy(l, buffer, length - 1, defaultText, static_cast<int32_t>(std::strlen(defaultText)), 0);
-    buffer[n > 0 ? n : 0] = 0;
+    if (!copyDefault(l, buffer, length, defaultText)) VL_RET(fail(l, VL_RC_NOMEM));
     vl::setRc(l, rc);
     VL_RET(uint32_t{0});
   }

@@ -73,12 +73,17 @@ inline bool startsKey(const map::Special &sp, VLUChar u) {
   return false;
 }
 
-// The language's upper-case special keys, filtered by first unit, and the one-byte values
-// of the code page that start one.
+// The language's upper-case special keys, filtered by first unit, and per one-byte value
+// its folded form with flags: kKey when it starts a key, kNul for the 0 that may end a
+// string. The common case (equal folds, no flag) then costs one table read a side.
+// ufold does the same for UTF-16 units below 256, kSlow marking the two whose upper case
+// lies above.
+constexpr uint16_t kKey = 0x100, kNul = 0x200, kSlow = 0x400;
 struct Keys {
   map::Special sp{nullptr, 44};
-  uint64_t bytes[4] = {};
-  bool byte(uint32_t v) const { return ((bytes[v >> 6] >> (v & 63)) & 1) != 0; }
+  bool special = false;  // the language's flag
+  uint16_t fold[256] = {}, ufold[256] = {};
+  bool byte(uint32_t v) const { return (fold[v] & kKey) != 0; }
 };
 
 // Building the filter walks the whole table, so each thread keeps the last one and
@@ -95,11 +100,17 @@ inline const Keys &upperKeys(const VLLocale *l) {
   const uint32_t gen = store::unloads.load(std::memory_order_acquire);
   const void *b = lang ? __atomic_load_n(&lang->section[0], __ATOMIC_ACQUIRE) : nullptr;
   if (c.lang != lang || c.page != l->codePage || c.body != b || c.unloads != gen) {
-    c.k.sp = map::Special(lang, 44);
-    for (uint64_t &w : c.k.bytes) w = 0;
-    for (uint32_t v = 0; v < 256; ++v)
-      if (startsKey(c.k.sp, cp::sbcsUni(l->codePage, static_cast<uint8_t>(v))))
-        c.k.bytes[v >> 6] |= uint64_t{1} << (v & 63);
+    c.k.special = specialCasing(l);
+    c.k.sp = map::Special(c.k.special ? lang : nullptr, 44);
+    const uint8_t *t = foldTable(l);
+    for (uint32_t v = 0; v < 256; ++v) {
+      const uint16_t nul = v ? 0 : kNul;
+      c.k.fold[v] = static_cast<uint16_t>(
+          t[v] | (startsKey(c.k.sp, cp::sbcsUni(l->codePage, static_cast<uint8_t>(v))) ? kKey : 0) | nul);
+      const VLUChar up = umap::toUpper(static_cast<VLUChar>(v));
+      const bool key = startsKey(c.k.sp, static_cast<VLUChar>(v));
+      c.k.ufold[v] = static_cast<uint16_t>((up < 256 ? up : kSlow) | (key ? kKey : 0) | nul);
+    }
     c.lang = lang, c.page = l->codePage, c.body = b, c.unloads = gen;
   }
   return c.k;
@@ -107,12 +118,6 @@ inline const Keys &upperKeys(const VLLocale *l) {
 
 // Whether special casing can change anything in s: without a key start, upper-casing it
 // with and without the special table gives the same text.
-template <class T, class IsKey>
-bool unitsNeedSpecial(const Keys &keys, const T *s, uint32_t n, IsKey isKey) {
-  for (uint32_t i = 0; i < n; ++i)
-    if (isKey(keys, s[i])) return true;
-  return false;
-}
 template <class F>
 bool bytesNeedSpecial(const Keys &keys, const VLCodePage *c, F f, const uint8_t *s, uint32_t n) {
   if (!keys.sp.active) return false;
@@ -231,9 +236,13 @@ inline int32_t firstDiff(const uint8_t a[4], const uint8_t b[4]) {
   return 0;
 }
 
-// Case-insensitive walk of two byte strings side by side over n bytes.
+// Case-insensitive walk of two byte strings side by side over n bytes. byteOrder: stand
+// in for the mapping, which orders characters of different lengths by their bytes
+// (a half-width katakana after a double-byte character led by 0x82); without it the
+// shorter character sorts first.
 template <class F>
-int32_t compareCase(const VLLocale *l, F f1, const uint8_t *s1, F f2, const uint8_t *s2, uint32_t n) {
+int32_t compareCase(const VLLocale *l, F f1, const uint8_t *s1, F f2, const uint8_t *s2, uint32_t n,
+                    bool byteOrder) {
   uint8_t a[4], b[4];
   if (!F::kShift && f1.singleByte()) {
     const uint8_t *t = foldTable(l);
@@ -262,6 +271,12 @@ int32_t compareCase(const VLLocale *l, F f1, const uint8_t *s1, F f2, const uint
       }
     }
     const uint32_t k1 = f1.len(s1 + p), k2 = f2.len(s2 + p);
+    if (k1 != k2 && byteOrder) {
+      foldCase<F>(l, s1 + p, k1, a);
+      foldCase<F>(l, s2 + p, k2, b);
+      const int r = std::memcmp(a, b, std::min({k1, k2, 4u}));
+      return r ? r : diff(k1, k2);
+    }
     if (k1 != k2 || n - p < k1) return diff(k1, k2);
     foldCase<F>(l, s1 + p, k1, a);
     foldCase<F>(l, s2 + p, k2, b);
@@ -298,12 +313,46 @@ void dump(Tracer &trc, const uint8_t *s1, uint32_t n1, const uint8_t *s2, uint32
   TRC1_Printf(trc.record(), "String2: %.*s", static_cast<int>(n2), reinterpret_cast<const char *>(s2));
 }
 
+// Case folded in a single-byte page: one pass over both strings up to the first
+// difference, the terminators of strlen lengths found on the way. False when a key start
+// comes first: only then can the mapping order the pair otherwise (what follows the
+// first difference cannot change the sign). Results are those of the general path.
+inline bool foldSingle(const Keys &k, const uint8_t *s1, int32_t len1, const uint8_t *s2, int32_t len2,
+                       int32_t *r) {
+  const uint32_t m1 = len1 < 0 ? UINT32_MAX : static_cast<uint32_t>(len1);
+  const uint32_t m2 = len2 < 0 ? UINT32_MAX : static_cast<uint32_t>(len2);
+  const uint32_t n = std::min(m1, m2);
+  uint32_t i = 0;
+  for (; i < n; ++i) {
+    const uint32_t a = k.fold[s1[i]], b = k.fold[s2[i]];
+    if (a == b && !(a & (kKey | kNul))) continue;
+    if ((a | b) & kKey) return false;
+    const bool end1 = len1 < 0 && !s1[i], end2 = len2 < 0 && !s2[i];
+    if (end1 || end2) {
+      const uint32_t n1 = end1 ? i : len1 < 0 ? i + length(s1 + i) : m1;
+      *r = diff(n1, end2 ? i : len2 < 0 ? i + length(s2 + i) : m2);
+      return true;
+    }
+    if (a != b) {
+      *r = static_cast<int32_t>(a & 0xFF) - static_cast<int32_t>(b & 0xFF);
+      return true;
+    }
+  }
+  *r = diff(len1 < 0 ? n + length(s1 + n) : m1, len2 < 0 ? n + length(s2 + n) : m2);
+  return true;
+}
+
 // The byte members after the option word has passed: plain (Bytes) and Ex (Shifted).
 template <class F, class Map>
 int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, const uint8_t *s2, int32_t len2,
                      uint32_t opts, Tracer &trc, Map map) {
   const bool chars = (opts & VL_OPT_CHARLEN) != 0;
   const Mode mode = modeOf(opts);
+  if constexpr (!F::kShift)
+    if (mode == Mode::Case && f1.singleByte() && s1 && s2 && !(opts & kCmpBlanks) && !trc.on(TRC1_STATE)) {
+      int32_t r;
+      if (foldSingle(upperKeys(l), s1, len1, s2, len2, &r)) return r;
+    }
   uint32_t n1 = byteLength(f1, s1, len1, chars), n2 = byteLength(f2, s2, len2, chars);
   if ((opts & kCmpBlanks) && (n1 || n2) && !dropBlanks(l, f1, s1, &n1, f2, s2, &n2, mode == Mode::Width)) {
     setRc(l, VL_RC_NOMEM);
@@ -327,21 +376,23 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
     case Mode::Exact:
       r = std::memcmp(s1, s2, n);
       break;
-    case Mode::Case:
-      if (specialCasing(l)) {
-        const Keys &keys = upperKeys(l);
+    case Mode::Case: {
+      const Keys &keys = upperKeys(l);
+      if (keys.special) {
         const bool special =
             bytesNeedSpecial(keys, l->codePage, f1, s1, n1) || bytesNeedSpecial(keys, l->codePage, f2, s2, n2);
-        // A single-byte page folds through its table below, exactly as the mapping would.
-        if (special || F::kShift || !f1.singleByte()) {
+        // Other pages fold through their tables below, exactly as the mapping would; UTF-8
+        // has no type records to fold by.
+        if (special || F::kShift || cp::isUtf8(l->codePage)) {
           auto byteMap = [&](uint8_t *out, int32_t cap, const uint8_t *s, uint32_t k, int which, uint32_t sel) {
             return map(cb(out), cap, cb(s), static_cast<int32_t>(k), which ? f2.state : f1.state, sel);
           };
           return compareMapped<uint8_t>(l, s1, n1, s2, n2, 8, false, special, byteMap);
         }
       }
-      r = compareCase(l, f1, s1, f2, s2, n);
+      r = compareCase(l, f1, s1, f2, s2, n, keys.special);
       break;
+    }
     case Mode::Width:
       if (!F::kShift && f1.singleByte()) {
         r = std::memcmp(s1, s2, n);  // case deliberately stays exact here
@@ -354,30 +405,46 @@ int32_t compareBytes(VLLocale *l, F f1, const uint8_t *s1, int32_t len1, F f2, c
   return r ? r : diff(n1, n2);
 }
 
-// W values and UTF-16 units. fold is applied to each unit when not comparing exactly;
-// with special casing, strings holding a key start (isKey(keys, unit)) go through map
-// instead, and fold must then upper-case as map does without the table.
+// W values and UTF-16 units. fold is applied to each unit when keys is given (case or
+// width folded); when the language cases specially, a pair whose strings hold a key start
+// (isKey(keys, unit)) before their first difference goes through map instead, and fold
+// must then upper-case as map does without the table. Units after the first difference
+// cannot change the sign: each maps to at least one unit, and the prefix before it maps
+// alike in both strings. Terminators of negative lengths are found on the way.
+// low, when given, holds for units below 256 what fold gives them with the flags of Keys;
+// pairs that fold alike without a flag then cost two table reads.
 template <class T, class Fold, class Map, class IsKey>
 int32_t compareUnits(VLLocale *l, const T *s1, int32_t len1, const T *s2, int32_t len2, bool blanks, T blank,
-                     bool exact, bool mapped, bool signOnly, Fold fold, Map map, IsKey isKey) {
-  uint32_t n1 = s1 ? resolveLen(s1, len1) : 0, n2 = s2 ? resolveLen(s2, len2) : 0;
-  if (blanks) {
-    while (n1 && s1[n1 - 1] == blank) --n1;
-    while (n2 && s2[n2 - 1] == blank) --n2;
+                     const Keys *keys, const uint16_t *low, bool signOnly, Fold fold, Map map, IsKey isKey) {
+  if (blanks || !s1 || !s2) {  // the ends are needed first
+    uint32_t n1 = s1 ? resolveLen(s1, len1) : 0, n2 = s2 ? resolveLen(s2, len2) : 0;
+    if (blanks) {
+      while (n1 && s1[n1 - 1] == blank) --n1;
+      while (n2 && s2[n2 - 1] == blank) --n2;
+    }
+    if (!n1 || !n2) return diff(n1, n2);
+    len1 = static_cast<int32_t>(std::min<uint32_t>(n1, INT32_MAX));
+    len2 = static_cast<int32_t>(std::min<uint32_t>(n2, INT32_MAX));
   }
-  if (!n1 || !n2) return diff(n1, n2);
-  if (!exact && mapped) {
-    const Keys &keys = upperKeys(l);
-    if (unitsNeedSpecial(keys, s1, n1, isKey) || unitsNeedSpecial(keys, s2, n2, isKey))
-      return compareMapped<T>(l, s1, n1, s2, n2, 2 * sizeof(T), true, true, map);  // a unit may become two
+  const bool z1 = len1 < 0, z2 = len2 < 0, special = keys && keys->special;
+  const uint32_t m1 = z1 ? UINT32_MAX : static_cast<uint32_t>(len1);
+  const uint32_t m2 = z2 ? UINT32_MAX : static_cast<uint32_t>(len2);
+  const uint32_t n = std::min(m1, m2);
+  uint32_t i = 0;
+  for (; i < n; ++i) {
+    const uint32_t a = s1[i], b = s2[i];
+    if (low && (a | b) < 256 && low[a] == low[b] && !(low[a] & (kKey | kNul | kSlow))) continue;
+    if (!(a && b) && ((!a && z1) || (!b && z2))) break;
+    if (special && (isKey(*keys, a) || (a != b && isKey(*keys, b))))  // a unit may become two
+      return compareMapped<T>(l, s1, z1 ? length(s1) : m1, s2, z2 ? length(s2) : m2, 2 * sizeof(T), true, true,
+                              map);
+    if (a == b) continue;
+    if (!keys) return diff(a, b);
+    const uint32_t fa = fold(a), fb = fold(b);
+    if (fa != fb) return signOnly ? (fa < fb ? -1 : 1) : diff(fa, fb);
   }
-  const uint32_t n = std::min(n1, n2);
-  for (uint32_t i = 0; i < n; ++i) {
-    uint32_t a = s1[i], b = s2[i];
-    if (!exact) a = fold(a), b = fold(b);
-    if (a != b) return signOnly && !exact ? (a < b ? -1 : 1) : diff(a, b);
-  }
-  return diff(n1, n2);
+  // Every unit before i is not 0 in a string measured to its 0.
+  return diff(z1 ? i + length(s1 + i) : m1, z2 ? i + length(s2 + i) : m2);
 }
 
 }  // namespace vl::str

@@ -17,7 +17,10 @@ int32_t VLStrcmpU(VLLocale *locale, const VLUChar *str1, int32_t len1, const VLU
   auto map = [l](VLUChar *out, int32_t cap, const VLUChar *in, uint32_t n, int, uint32_t sel) {
     return VLMapStringU(l, out, cap, in, static_cast<int32_t>(n), sel);
   };
-  VL_RET(compareUnits<VLUChar>(l, str1, len1, str2, len2, (options & kCmpBlanks) != 0, VLUChar{0x20},
-                               mode == Mode::Exact, mode == Mode::Case && specialCasing(l), true, fold, map,
-                               [](const Keys &k, VLUChar u) { return startsKey(k.sp, u); }));
+  // Width folding has no special table: an empty set of keys stands for it.
+  static const Keys kNoKeys;
+  const Keys *keys = mode == Mode::Exact ? nullptr : mode == Mode::Case ? &upperKeys(l) : &kNoKeys;
+  VL_RET(compareUnits<VLUChar>(l, str1, len1, str2, len2, (options & kCmpBlanks) != 0, VLUChar{0x20}, keys,
+                               mode == Mode::Case ? keys->ufold : nullptr, true,
+                               fold, map, [](const Keys &k, VLUChar u) { return startsKey(k.sp, u); }));
 }

@@ -143,6 +143,11 @@ TEST_F(Catalog, EveryDirectiveReadBackInBothModesIntoOtherCodePages) {
           while (u[n]) ++n;
           EXPECT_EQ(iconvTo("UTF-8", Bytes(reinterpret_cast<char *>(u), 2 * n), "UTF-16LE"), text) << p.name << " via " << other;
         }
+        char b5[5];
+        EXPECT_EQ(VLGetMessage(oc, 1, 5, b5, 5, "\x0E\x45\x41\x45\x42\x0F", 0), 0u);
+        if (o->flags & VL_LF_SHIFT) {
+          EXPECT_EQ(Bytes(b5), "\x0E\x45\x41\x0F") << "a cut default closes its double-byte run";
+        }
         VLCloseCatalog(oc);
         VLReleaseLocale(o);
       }

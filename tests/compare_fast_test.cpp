@@ -20,13 +20,14 @@ int orderOf(const std::vector<T> &a, const std::vector<T> &b) {
 }
 
 // Letters that stress the fold: keys of the special tables (sharp s, n preceded by
-// apostrophe, ligatures, dotted and dotless i), their upper-case forms, and plain text.
+// apostrophe, ligatures, dotted and dotless i), their upper-case forms, plain text and
+// half-width katakana (one byte beside double-byte characters).
 std::vector<VLUChar> alphabet() {
   std::vector<VLUChar> a;
   for (VLUChar u = 'A'; u <= 'Z'; ++u) a.push_back(u);
   for (VLUChar u = 'a'; u <= 'z'; ++u) a.push_back(u);
   for (VLUChar u : {0x20, 0xC4, 0xE4, 0xC9, 0xE9, 0xDF, 0x149, 0x130, 0x131, 0x15E, 0x15F, 0xFB00, 0xFB01, 0xFB03,
-                    0x390, 0x3B1, 0x391, 0x1E9E, 0x307, 0xFF21, 0xFF41, 0x3042, 0x4E00, 0x30A2})
+                    0x390, 0x3B1, 0x391, 0x1E9E, 0x307, 0xFF21, 0xFF41, 0x3042, 0x4E00, 0x30A2, 0xFF71, 0xFF9E})
     a.push_back(u);
   return a;
 }

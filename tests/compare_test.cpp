@@ -50,6 +50,7 @@ TEST_F(Compare, OptionsInEachPage) {
       {"but not without case alone", &Compare::mb_, B("\x82\x60", 2), "A", kCase, 1},
       {"full-width blanks go with width", &Compare::mb_, B("a\x81\x40", 3), "a", kBlanks | kWidth, 0},
       {"a kanji against a letter", &Compare::mb_, B("\x88\xEA", 2), "a", kCase, 1},
+      {"a half-width katakana after a double-byte letter", &Compare::mb_, "\xB1", B("\x82\x60", 2), kCase, 1},
       {"a prefix sorts first in IBM930", &Compare::sh_, "\xC1\xC2\xC3", "\xC1\xC2\xC3\xC4", kCase, -1},
       {"Shift-Out first equals the double-byte state", &Compare::sh_, B("\x0E\x45\x41", 3), B("\x45\x41", 2), 0, 0,
        0, 1},
