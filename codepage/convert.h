@@ -125,6 +125,19 @@ struct SbReader {
     }
     return plain;
   }
+  // The bytes that do not decode to themselves all lie in [winLo, winLo + winSpan).
+  unsigned winLo = ~0u, winSpan = 0;
+  // True when that window leaves ASCII out and is not empty.
+  bool window() requires requires { d.sb; } {
+    if (winLo == ~0u) {
+      unsigned lo = 0x100, hi = 0;
+      for (unsigned b = 0; b < 0x100; ++b)
+        if (rd16(d.sb + 2u * b) != b) lo = std::min(lo, b), hi = b + 1;
+      winLo = lo;
+      winSpan = hi > lo ? hi - lo : 0;
+    }
+    return winLo >= 0x80 && winSpan;
+  }
 };
 
 // Length from the lead byte: the code page's table, or UTF-8 arithmetic.
@@ -481,6 +494,69 @@ struct WWriter {
   }
 };
 
+// ---- Blocks of mixed text -------------------------------------------------------------
+// Pairs with a block loop convert many characters a step (simd.h) and leave what a step
+// does not take to the character loop. blocksOn says once per call whether the pages
+// allow it.
+
+// A single-byte page whose ASCII decodes to itself: widen, then patch the bytes of the
+// window from the table (in Western pages a few control positions, or the upper half).
+template <class D>
+inline bool blocksOn(SbReader<D> &r, U16Writer &) requires requires { r.d.sb; } { return r.window(); }
+template <class D>
+inline size_t blocks(SbReader<D> &r, U16Writer &w, size_t n) requires requires { r.d.sb; } {
+  size_t i = 0;
+  const auto lo = static_cast<uint8_t>(r.winLo), span = static_cast<uint8_t>(r.winSpan);
+  for (; i + 16 <= n; i += 16)
+    for (unsigned m = simd::widenBlock(r.p + i, w.o + i, lo, span); m; m &= m - 1) {
+      unsigned j = static_cast<unsigned>(__builtin_ctz(m));
+      w.o[i + j] = static_cast<VLUChar>(r.d.one(r.p[i + j]));
+    }
+  r.p += i;
+  w.o += i;
+  return i;
+}
+
+// To a single-byte page that keeps ASCII but not all of 0x00-0xFF: narrow, then patch the
+// other units through the encoder. A unit that takes more than one byte ends the step.
+inline bool blocksOn(U16Reader &, ByteWriter<IndexEnc> &w) {
+  return cp::maxLen(w.enc.cp) == 1 && w.plainBelow() == 0x80;
+}
+inline size_t blocks(U16Reader &r, ByteWriter<IndexEnc> &w, size_t n) {
+  size_t i = 0;
+  for (; i + 16 <= n; i += 16)
+    for (unsigned m = simd::narrowBlock(r.p + i, w.o + i, 0x80); m; m &= m - 1) {
+      unsigned j = static_cast<unsigned>(__builtin_ctz(m));
+      uint8_t b[IndexEnc::kMax];
+      if (w.enc(r.p[i + j], b) != 1) {
+        i += j;
+        r.p += i;
+        w.o += i;
+        return i;
+      }
+      w.o[i + j] = b[0];
+    }
+  r.p += i;
+  w.o += i;
+  return i;
+}
+
+// UTF-8 and UTF-16 both ways, where the page's ASCII is plain.
+inline bool blocksOn(MbReader<Utf8Len, Utf8Uni> &r, U16Writer &) { return r.plainBelow() >= 0x80; }
+inline size_t blocks(MbReader<Utf8Len, Utf8Uni> &r, U16Writer &w, size_t n) {
+  simd::Moved m = simd::utf8ToUtf16(r.p, w.o, n);
+  r.p += m.in;
+  w.o += m.out;
+  return m.out;
+}
+inline bool blocksOn(U16Reader &, ByteWriter<Utf8Enc> &) { return true; }
+inline size_t blocks(U16Reader &r, ByteWriter<Utf8Enc> &w, size_t n) {
+  simd::Moved m = simd::utf16ToUtf8(r.p, w.o, n);
+  r.p += m.in;
+  w.o += m.out;
+  return m.in;
+}
+
 // ---- The loop -----------------------------------------------------------------------
 // Converts until the input ends (Done), a character is cut short (Partial, left unread)
 // or the output or the character limit is reached (Full: the character read is in held).
@@ -495,8 +571,25 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
       W lw = w;
       size_t i = 0;
       unsigned lim = 0;
+      bool blocked = false;
+      if constexpr (requires { blocks(lr, lw, n); }) {
+        if (n >= 32 && blocksOn(lr, lw)) {
+          blocked = true;
+          while (i < n) {
+            i += blocks(lr, lw, n - i);
+            // Where a step stopped, a stretch one by one, then steps again.
+            size_t m = std::min<size_t>(n - i, 16);
+            for (size_t j = 0; j < m; ++j) {
+              Value v;
+              (void)lr.fast(v);  // these readers never refuse
+              lw.fast(v);
+            }
+            i += m;
+          }
+        }
+      }
       if constexpr (requires { plainCopy(lr.p, lw.o, n, 0u); }) {
-        if (n >= 32) lim = std::min(lr.plainBelow(), lw.plainBelow());
+        if (n >= 32 && !blocked) lim = std::min(lr.plainBelow(), lw.plainBelow());
         // Runs pay only where every byte is plain: in other pages the runs of real text
         // are shorter than a block, and the table loop below is faster there.
         if (lim < 0x100) lim = 0;

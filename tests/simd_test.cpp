@@ -4,10 +4,13 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <map>
 #include <random>
+#include <tuple>
 #include <string>
 #include <vector>
 
+#include "codepage/cpbody.h"
 #include "codepage/simd.h"
 #include "support/hooks.h"
 
@@ -155,6 +158,57 @@ TEST_F(SimdConvert, EveryLevelGivesTheSameBytes) {
       EXPECT_EQ(back[i], back[i % per]) << name << " level " << i / per;
     }
     VLReleaseLocale(l);
+  }
+}
+
+// Random units and bytes soured with stray bytes, through pages of every block kind, with
+// the output cut at every size around the block widths and the input at every alignment:
+// each level returns the same count and leaves the same whole buffer.
+TEST_F(SimdConvert, EveryLevelAgreesOnMixedTextAndCutOutput) {
+  std::mt19937 rng(9);
+  const std::pair<char16_t, char16_t> ranges[] = {{0x20, 0x7E}, {0x20, 0x7E}, {0x20, 0x7E}, {0x80, 0xFF},
+                                                  {0x100, 0x7FF}, {0x800, 0xFFFF}};
+  std::u16string units;
+  while (units.size() < 3000) {
+    auto [lo, hi] = ranges[rng() % std::size(ranges)];
+    for (size_t k = 1 + rng() % 20; k--;) units.push_back(static_cast<char16_t>(lo + rng() % (hi - lo + 1)));
+  }
+  for (uint16_t id : {57352, 1252, 850, 37}) {
+    uint32_t rc;
+    VLObjEntry *e = VLGetObjFromID(vlglobals->objManager, VL_OBJ_CODEPAGE, id, 0, &rc);
+    ASSERT_NE(e, nullptr) << id;
+    VLLocale l{};
+    l.codePage = e;
+    l.flags = id == 57352 ? 0 : VL_LF_SINGLEBYTE;
+    std::vector<char> bytes(units.size() * 3);
+    int32_t nb = VLUnicodeToString(&l, bytes.data(), static_cast<int32_t>(bytes.size()),
+                                   reinterpret_cast<const VLUChar *>(units.data()), static_cast<int32_t>(units.size()), 0);
+    ASSERT_GT(nb, 0);
+    bytes.resize(static_cast<size_t>(nb));
+    for (size_t k = 0; k < bytes.size() / 50; ++k) bytes[rng() % bytes.size()] = static_cast<char>(0x80 + rng() % 0x80);
+    // (level, offset, size) -> count and buffer, compared with the scalar level's.
+    std::map<std::tuple<int, size_t, int32_t>, std::pair<int32_t, std::vector<char>>> seen;
+    for (int lv : levels()) {
+      simd::capLevel(lv);
+      for (size_t off = 0; off < 32; ++off)
+        for (int32_t size : {0, 7, 16, 31, 32, 33, 47, 48, 64, 65, 100, 127, 128, 129, 4000, 9000}) {
+          std::vector<char> b(static_cast<size_t>(size) + 1, 'x');
+          std::vector<VLUChar> u(static_cast<size_t>(size) + 1, 0x5555);
+          int32_t m = VLUnicodeToString(&l, b.data(), size, reinterpret_cast<const VLUChar *>(units.data()) + off,
+                                        static_cast<int32_t>(units.size() - off), 0);
+          int32_t k = VLStringToUnicode(u.data(), size, &l, bytes.data() + off, static_cast<int32_t>(bytes.size() - off), 0);
+          b.insert(b.end(), reinterpret_cast<char *>(u.data()), reinterpret_cast<char *>(u.data() + u.size()));
+          auto at = seen.find({simd::kScalar, off, size});
+          if (at == seen.end()) {
+            seen[{lv, off, size}] = {m * 100000 + k, b};
+            continue;
+          }
+          std::string where = "page " + std::to_string(id) + " level " + std::to_string(lv) + " offset " +
+                              std::to_string(off) + " size " + std::to_string(size);
+          EXPECT_EQ(m * 100000 + k, at->second.first) << where;
+          EXPECT_TRUE(b == at->second.second) << where;
+        }
+    }
   }
 }
 
