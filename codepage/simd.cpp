@@ -50,6 +50,7 @@ size_t copyScalar(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) {
 // Mixed blocks are left to the character loop.
 Moved utf8None(const uint8_t *, VLUChar *, size_t) { return {0, 0}; }
 Moved utf16None(const VLUChar *, uint8_t *, size_t) { return {0, 0}; }
+size_t mapNone(const uint8_t *, VLUChar *, size_t, const uint8_t *) { return 0; }
 
 #ifdef VL_SIMD_X86
 
@@ -181,7 +182,8 @@ constexpr Groups makeGroups() {
   for (unsigned m = 0; m < 256; ++m) {
     unsigned p = 0;
     for (unsigned j = 0; j < 4; ++j)
-      for (unsigned k = 0; k <= std::min((m >> 2 * j) & 3, 2u); ++k) t.shuffle[m][p++] = static_cast<uint8_t>(4 * j + k);
+      for (unsigned k = 0; k <= std::min((m >> 2 * j) & 3, 2u); ++k)
+        t.shuffle[m][p++] = static_cast<uint8_t>(4 * j + k);
     t.length[m] = static_cast<uint8_t>(p);
     for (; p < 16; ++p) t.shuffle[m][p] = 0x80;
   }
@@ -190,6 +192,12 @@ constexpr Groups makeGroups() {
   return t;
 }
 constexpr Groups kGroups = makeGroups();
+
+// 16 bytes put in the order a shuffle row gives, stored unaligned.
+[[gnu::target("avx2"), gnu::always_inline]] inline void storeShuffled(void *d, __m128i v, const uint8_t *row) {
+  __m128i x = _mm_shuffle_epi8(v, _mm_load_si128(reinterpret_cast<const __m128i *>(row)));
+  _mm_storeu_si128(reinterpret_cast<__m128i *>(d), x);
+}
 
 // SSE2 has no byte shuffle: it takes the ASCII blocks and leaves the rest.
 Moved utf8ToUtf16Sse2(const uint8_t *s, VLUChar *d, size_t n) {
@@ -245,22 +253,67 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
     unsigned cut = lead >> 15 ? 15 : (three >> 14) & 1 ? 14 : 16;
     unsigned keep = ~cont & ((1u << cut) - 1);
     __m256i b1 = _mm256_cvtepu8_epi16(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + 1)));
-    __m256i b2 = _mm256_cvtepu8_epi16(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + 2)));
-    __m256i mid = _mm256_slli_epi16(_mm256_and_si256(b1, low6), 6);
-    __m256i v2 = _mm256_or_si256(_mm256_slli_epi16(_mm256_and_si256(b0, low5), 6), _mm256_and_si256(b1, low6));
-    __m256i v3 = _mm256_or_si256(_mm256_or_si256(_mm256_slli_epi16(b0, 12), mid), _mm256_and_si256(b2, low6));
-    __m256i v = _mm256_blendv_epi8(v2, v3, _mm256_cmpgt_epi16(b0, two));
+    __m256i v = _mm256_or_si256(_mm256_slli_epi16(_mm256_and_si256(b0, low5), 6), _mm256_and_si256(b1, low6));
+    if (three) {  // Western text seldom has any
+      __m256i b2 = _mm256_cvtepu8_epi16(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + 2)));
+      __m256i mid = _mm256_slli_epi16(_mm256_and_si256(b1, low6), 6);
+      __m256i v3 = _mm256_or_si256(_mm256_or_si256(_mm256_slli_epi16(b0, 12), mid), _mm256_and_si256(b2, low6));
+      v = _mm256_blendv_epi8(v, v3, _mm256_cmpgt_epi16(b0, two));
+    }
     v = _mm256_blendv_epi8(v, b0, _mm256_cmpgt_epi16(ascii, b0));
     unsigned k0 = keep & 0xFF, k1 = keep >> 8;
-    const auto *t0 = reinterpret_cast<const __m128i *>(kShuffles.units[k0]);
-    const auto *t1 = reinterpret_cast<const __m128i *>(kShuffles.units[k1]);
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + out), _mm_shuffle_epi8(_mm256_castsi256_si128(v), _mm_load_si128(t0)));
+    storeShuffled(d + out, _mm256_castsi256_si128(v), kShuffles.units[k0]);
     out += static_cast<unsigned>(__builtin_popcount(k0));
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + out), _mm_shuffle_epi8(_mm256_extracti128_si256(v, 1), _mm_load_si128(t1)));
+    storeShuffled(d + out, _mm256_extracti128_si256(v, 1), kShuffles.units[k1]);
     out += static_cast<unsigned>(__builtin_popcount(k1));
     in += cut;
   }
   return {in, out};
+}
+
+// Bytes through a table of 256 units, 32 a step. The table is split into low and high
+// bytes, 16 rows of 16; a byte's low nibble picks in every row at once, and only its own
+// row (the high nibble) lets the pick through: the others get bit 7 set, which zeroes it.
+template <bool Wide>
+[[gnu::target("avx2")]] size_t mapRows(const uint8_t *s, VLUChar *d, size_t n, const __m256i *lo, const __m256i *hi) {
+  const __m256i bias = _mm256_set1_epi8(0x70), row = _mm256_set1_epi8(0x10);
+  size_t i = 0;
+  for (; i + 32 <= n; i += 32) {
+    __m256i x = _mm256_loadu_si256(reinterpret_cast<const __m256i *>(s + i));
+    __m256i rl = _mm256_setzero_si256(), rh = _mm256_setzero_si256();
+#pragma GCC unroll 16
+    for (unsigned k = 0; k < 16; ++k) {
+      // Row k's bytes are now below 0x10; the bias leaves them clear of bit 7 and sets it
+      // on every other (those below wrapped round to the top).
+      __m256i u = _mm256_adds_epu8(x, bias);
+      rl = _mm256_or_si256(rl, _mm256_shuffle_epi8(lo[k], u));
+      if constexpr (Wide) rh = _mm256_or_si256(rh, _mm256_shuffle_epi8(hi[k], u));
+      x = _mm256_sub_epi8(x, row);
+    }
+    // Unpacking works within 128-bit lanes: order the quarters so the units come out in turn.
+    rl = _mm256_permute4x64_epi64(rl, 0xD8);
+    rh = _mm256_permute4x64_epi64(rh, 0xD8);
+    _mm256_storeu_si256(reinterpret_cast<__m256i *>(d + i), _mm256_unpacklo_epi8(rl, rh));
+    _mm256_storeu_si256(reinterpret_cast<__m256i *>(d + i + 16), _mm256_unpackhi_epi8(rl, rh));
+  }
+  return i;
+}
+
+[[gnu::target("avx2")]] size_t mapBytesAvx2(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table) {
+  __m256i lo[16], hi[16];
+  const __m128i low8 = _mm_set1_epi16(0xFF);
+  __m128i anyHigh = _mm_setzero_si128();
+  for (unsigned k = 0; k < 16; ++k) {
+    __m128i a = _mm_loadu_si128(reinterpret_cast<const __m128i *>(table + 32 * k));
+    __m128i b = _mm_loadu_si128(reinterpret_cast<const __m128i *>(table + 32 * k + 16));
+    __m128i h = _mm_packus_epi16(_mm_srli_epi16(a, 8), _mm_srli_epi16(b, 8));
+    lo[k] = _mm256_broadcastsi128_si256(_mm_packus_epi16(_mm_and_si128(a, low8), _mm_and_si128(b, low8)));
+    hi[k] = _mm256_broadcastsi128_si256(h);
+    anyHigh = _mm_or_si128(anyHigh, h);
+  }
+  // Pages whose units all lie below 0x100 (EBCDIC Latin-1) skip the high half.
+  if (_mm_testz_si128(anyHigh, anyHigh)) return mapRows<false>(s, d, n, lo, hi);
+  return mapRows<true>(s, d, n, lo, hi);
 }
 
 // Units at or above bound, by bit (a 16-unit block gives bits 0-7 and 16-23). Unsigned: a
@@ -282,7 +335,8 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
     __m256i v = _mm256_cvtepu16_epi32(h ? _mm256_extracti128_si256(u, 1) : _mm256_castsi256_si128(u));
     __m256i t0 = _mm256_or_si256(_mm256_and_si256(v, low6), tail);
     __m256i t1 = _mm256_or_si256(_mm256_and_si256(_mm256_srli_epi32(v, 6), low6), tail);
-    __m256i pair = _mm256_or_si256(_mm256_or_si256(_mm256_srli_epi32(v, 6), _mm256_set1_epi32(0xC0)), _mm256_slli_epi32(t0, 8));
+    __m256i pair =
+        _mm256_or_si256(_mm256_or_si256(_mm256_srli_epi32(v, 6), _mm256_set1_epi32(0xC0)), _mm256_slli_epi32(t0, 8));
     __m256i triple = _mm256_or_si256(_mm256_or_si256(_mm256_srli_epi32(v, 12), _mm256_set1_epi32(0xE0)),
                                      _mm256_or_si256(_mm256_slli_epi32(t1, 8), _mm256_slli_epi32(t0, 16)));
     __m256i b = _mm256_blendv_epi8(v, pair, _mm256_cmpgt_epi32(v, _mm256_set1_epi32(0x7F)));
@@ -290,9 +344,7 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
     for (unsigned q = 0; q < 2; ++q) {
       unsigned at = 8 * h + 4 * q;
       unsigned m = kGroups.spread[two >> at & 15] + kGroups.spread[three >> at & 15];
-      __m128i g = q ? _mm256_extracti128_si256(b, 1) : _mm256_castsi256_si128(b);
-      g = _mm_shuffle_epi8(g, _mm_load_si128(reinterpret_cast<const __m128i *>(kGroups.shuffle[m])));
-      _mm_storeu_si128(reinterpret_cast<__m128i *>(d + out), g);
+      storeShuffled(d + out, q ? _mm256_extracti128_si256(b, 1) : _mm256_castsi256_si128(b), kGroups.shuffle[m]);
       out += kGroups.length[m];
     }
   }
@@ -304,7 +356,8 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
 // 32-bit lanes. A step writes up to 12 bytes past its output, so it runs only while 16
 // more units, which will cover them, remain allowed.
 [[gnu::target("avx2")]] Moved utf16ToUtf8Avx2(const VLUChar *s, uint8_t *d, size_t n) {
-  const __m256i ascii = _mm256_set1_epi16(static_cast<short>(0xFF80)), wide = _mm256_set1_epi16(static_cast<short>(0xF800));
+  const __m256i ascii = _mm256_set1_epi16(static_cast<short>(0xFF80));
+  const __m256i wide = _mm256_set1_epi16(static_cast<short>(0xF800));
   const __m256i x7f = _mm256_set1_epi16(0x7F), low6 = _mm256_set1_epi16(0x3F);
   const __m256i leadBits = _mm256_set1_epi16(0xC0), tailBits = _mm256_set1_epi16(static_cast<short>(0x8000));
   size_t in = 0, out = 0;
@@ -326,11 +379,9 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
     __m256i w = _mm256_blendv_epi8(u, pair, isTwo);
     unsigned m = static_cast<unsigned>(_mm256_movemask_epi8(_mm256_packs_epi16(isTwo, _mm256_setzero_si256())));
     unsigned m0 = m & 0xFF, m1 = (m >> 16) & 0xFF;
-    const auto *t0 = reinterpret_cast<const __m128i *>(kShuffles.pairs[m0]);
-    const auto *t1 = reinterpret_cast<const __m128i *>(kShuffles.pairs[m1]);
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + out), _mm_shuffle_epi8(_mm256_castsi256_si128(w), _mm_load_si128(t0)));
+    storeShuffled(d + out, _mm256_castsi256_si128(w), kShuffles.pairs[m0]);
     out += 8 + static_cast<unsigned>(__builtin_popcount(m0));
-    _mm_storeu_si128(reinterpret_cast<__m128i *>(d + out), _mm_shuffle_epi8(_mm256_extracti128_si256(w, 1), _mm_load_si128(t1)));
+    storeShuffled(d + out, _mm256_extracti128_si256(w, 1), kShuffles.pairs[m1]);
     out += 8 + static_cast<unsigned>(__builtin_popcount(m1));
   }
   return {in, out};
@@ -356,12 +407,14 @@ constexpr Run<VLUChar, uint8_t> kNarrow[] = {narrowScalar, narrowSse2, narrowAvx
 constexpr Run<uint8_t, uint8_t> kCopy[] = {copyScalar, copySse2, copyAvx2};
 constexpr Moved (*kUtf8In[])(const uint8_t *, VLUChar *, size_t) = {utf8None, utf8ToUtf16Sse2, utf8ToUtf16Avx2};
 constexpr Moved (*kUtf8Out[])(const VLUChar *, uint8_t *, size_t) = {utf16None, utf16ToUtf8Sse2, utf16ToUtf8Avx2};
+constexpr size_t (*kMapBytes[])(const uint8_t *, VLUChar *, size_t, const uint8_t *) = {mapNone, mapNone, mapBytesAvx2};
 #else
 constexpr Run<uint8_t, VLUChar> kWiden[] = {widenScalar, widenScalar, widenScalar};
 constexpr Run<VLUChar, uint8_t> kNarrow[] = {narrowScalar, narrowScalar, narrowScalar};
 constexpr Run<uint8_t, uint8_t> kCopy[] = {copyScalar, copyScalar, copyScalar};
 constexpr Moved (*kUtf8In[])(const uint8_t *, VLUChar *, size_t) = {utf8None, utf8None, utf8None};
 constexpr Moved (*kUtf8Out[])(const VLUChar *, uint8_t *, size_t) = {utf16None, utf16None, utf16None};
+constexpr size_t (*kMapBytes[])(const uint8_t *, VLUChar *, size_t, const uint8_t *) = {mapNone, mapNone, mapNone};
 #endif
 
 }  // namespace
@@ -371,5 +424,8 @@ size_t narrow(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) { return kNa
 size_t copy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) { return kCopy[level()](s, d, n, lim); }
 Moved utf8ToUtf16(const uint8_t *s, VLUChar *d, size_t n) { return kUtf8In[level()](s, d, n); }
 Moved utf16ToUtf8(const VLUChar *s, uint8_t *d, size_t n) { return kUtf8Out[level()](s, d, n); }
+size_t mapBytes(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table) {
+  return kMapBytes[level()](s, d, n, table);
+}
 
 }  // namespace vl::simd

@@ -91,6 +91,10 @@ Moved utf8ToUtf16(const uint8_t *s, VLUChar *d, size_t n);
 // 3n bytes.
 Moved utf16ToUtf8(const VLUChar *s, uint8_t *d, size_t n);
 
+// Bytes through a table of 256 native-order units, a block at a time; returns how many
+// (a multiple of the block, or 0 where the level has no table shuffle).
+size_t mapBytes(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table);
+
 // Widens 16 bytes and returns the mask of those in [lo, lo + span), which the caller
 // patches from its table; every other byte is its own value.
 inline unsigned widenBlock(const uint8_t *s, VLUChar *d, uint8_t lo, uint8_t span) {

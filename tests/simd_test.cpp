@@ -181,8 +181,9 @@ TEST_F(SimdConvert, EveryLevelAgreesOnMixedTextAndCutOutput) {
     l.codePage = e;
     l.flags = id == 57352 ? 0 : VL_LF_SINGLEBYTE;
     std::vector<char> bytes(units.size() * 3);
-    int32_t nb = VLUnicodeToString(&l, bytes.data(), static_cast<int32_t>(bytes.size()),
-                                   reinterpret_cast<const VLUChar *>(units.data()), static_cast<int32_t>(units.size()), 0);
+    auto *text = reinterpret_cast<const VLUChar *>(units.data());
+    int32_t nb = VLUnicodeToString(&l, bytes.data(), static_cast<int32_t>(bytes.size()), text,
+                                   static_cast<int32_t>(units.size()), 0);
     ASSERT_GT(nb, 0);
     bytes.resize(static_cast<size_t>(nb));
     for (size_t k = 0; k < bytes.size() / 50; ++k) bytes[rng() % bytes.size()] = static_cast<char>(0x80 + rng() % 0x80);
@@ -194,9 +195,9 @@ TEST_F(SimdConvert, EveryLevelAgreesOnMixedTextAndCutOutput) {
         for (int32_t size : {0, 7, 16, 31, 32, 33, 47, 48, 64, 65, 100, 127, 128, 129, 4000, 9000}) {
           std::vector<char> b(static_cast<size_t>(size) + 1, 'x');
           std::vector<VLUChar> u(static_cast<size_t>(size) + 1, 0x5555);
-          int32_t m = VLUnicodeToString(&l, b.data(), size, reinterpret_cast<const VLUChar *>(units.data()) + off,
-                                        static_cast<int32_t>(units.size() - off), 0);
-          int32_t k = VLStringToUnicode(u.data(), size, &l, bytes.data() + off, static_cast<int32_t>(bytes.size() - off), 0);
+          int32_t m = VLUnicodeToString(&l, b.data(), size, text + off, static_cast<int32_t>(units.size() - off), 0);
+          int32_t k = VLStringToUnicode(u.data(), size, &l, bytes.data() + off,
+                                        static_cast<int32_t>(bytes.size() - off), 0);
           b.insert(b.end(), reinterpret_cast<char *>(u.data()), reinterpret_cast<char *>(u.data() + u.size()));
           auto at = seen.find({simd::kScalar, off, size});
           if (at == seen.end()) {
