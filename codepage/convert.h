@@ -131,11 +131,9 @@ struct SbReader {
   // True when that window leaves ASCII out and is not empty.
   bool window() requires requires { d.sb; } {
     if (winLo == ~0u) {
-      unsigned lo = 0x100, hi = 0;
-      for (unsigned b = 0; b < 0x100; ++b)
-        if (rd16(d.sb + 2u * b) != b) lo = std::min(lo, b), hi = b + 1;
-      winLo = lo;
-      winSpan = hi > lo ? hi - lo : 0;
+      unsigned hi;
+      simd::unlikeSpan(d.sb, winLo, hi);
+      winSpan = hi > winLo ? hi - winLo : 0;
     }
     return winLo >= 0x80 && winSpan;
   }

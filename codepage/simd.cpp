@@ -424,6 +424,27 @@ size_t narrow(const VLUChar *s, uint8_t *d, size_t n, unsigned lim) { return kNa
 size_t copy(const uint8_t *s, uint8_t *d, size_t n, unsigned lim) { return kCopy[level()](s, d, n, lim); }
 Moved utf8ToUtf16(const uint8_t *s, VLUChar *d, size_t n) { return kUtf8In[level()](s, d, n); }
 Moved utf16ToUtf8(const VLUChar *s, uint8_t *d, size_t n) { return kUtf8Out[level()](s, d, n); }
+void unlikeSpan(const uint8_t *table, unsigned &lo, unsigned &hi) {
+  lo = 0x100;
+  hi = 0;
+#ifdef VL_SIMD_X86
+  __m128i at = _mm_setr_epi16(0, 1, 2, 3, 4, 5, 6, 7);
+  for (unsigned k = 0; k < 32; ++k, at = _mm_add_epi16(at, _mm_set1_epi16(8))) {
+    __m128i t = _mm_loadu_si128(reinterpret_cast<const __m128i *>(table + 16 * k));
+    unsigned m = static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi16(t, at))) ^ 0xFFFF;
+    if (!m) continue;
+    lo = std::min(lo, 8 * k + static_cast<unsigned>(__builtin_ctz(m)) / 2);
+    hi = 8 * k + (31 - static_cast<unsigned>(__builtin_clz(m))) / 2 + 1;
+  }
+#else
+  for (unsigned b = 0; b < 0x100; ++b) {
+    uint16_t u;
+    std::memcpy(&u, table + 2 * b, 2);
+    if (u != b) lo = std::min(lo, b), hi = b + 1;
+  }
+#endif
+}
+
 size_t mapBytes(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table) {
   return kMapBytes[level()](s, d, n, table);
 }

@@ -91,6 +91,10 @@ Moved utf8ToUtf16(const uint8_t *s, VLUChar *d, size_t n);
 // 3n bytes.
 Moved utf16ToUtf8(const VLUChar *s, uint8_t *d, size_t n);
 
+// The span [lo, hi) of the bytes whose unit in a table of 256 native-order units is not
+// the byte itself (lo >= hi when there is none). Cheap enough to take on every call.
+void unlikeSpan(const uint8_t *table, unsigned &lo, unsigned &hi);
+
 // Bytes through a table of 256 native-order units, a block at a time; returns how many
 // (a multiple of the block, or 0 where the level has no table shuffle).
 size_t mapBytes(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table);
