@@ -104,6 +104,29 @@ TEST(Simd, EveryLevelCopiesTheSameRuns) {
       }
 }
 
+// Table mapping, with units that fit a byte (one table half) and units that do not.
+TEST(Simd, EveryLevelMapsBytesThroughTheTable) {
+  LevelGuard guard;
+  std::mt19937 rng(3);
+  for (unsigned top : {0x100u, 0x10000u}) {
+    std::vector<uint16_t> table(256);
+    for (auto &u : table) u = static_cast<uint16_t>(rng() % top);
+    std::vector<uint8_t> bytes(160);
+    for (auto &b : bytes) b = static_cast<uint8_t>(rng());
+    for (int l : levels()) {
+      simd::capLevel(l);
+      for (size_t off = 0; off < 32; ++off)
+        for (size_t n = 0; n <= 96; ++n) {
+          std::vector<VLUChar> d(n + 1, 0xAAAA);
+          size_t k = simd::mapBytes(bytes.data() + off, d.data(), n, reinterpret_cast<const uint8_t *>(table.data()));
+          ASSERT_TRUE(k <= n && (l == simd::kAvx2 ? k == n - n % 32 : k == 0)) << "level " << l << " n " << n;
+          for (size_t j = 0; j <= n; ++j)
+            ASSERT_EQ(d[j], j < k ? table[bytes[off + j]] : 0xAAAA) << "level " << l << " n " << n << " at " << j;
+        }
+    }
+  }
+}
+
 // Whole conversions over text with runs broken at every distance, at every level.
 class SimdConvert : public ::testing::Test {
  protected:
