@@ -231,7 +231,6 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
 // continuation positions squeezed out. A character that runs past the block is left to
 // the next one.
 [[gnu::target("avx2")]] Moved utf8ToUtf16Avx2(const uint8_t *s, VLUChar *d, size_t n) {
-  const __m128i c0 = _mm_set1_epi8(static_cast<char>(0xC0)), e0 = _mm_set1_epi8(static_cast<char>(0xE0));
   const __m256i low6 = _mm256_set1_epi16(0x3F), low5 = _mm256_set1_epi16(0x1F);
   const __m256i ascii = _mm256_set1_epi16(0x80), two = _mm256_set1_epi16(0xDF);
   size_t in = 0, out = 0;
@@ -246,8 +245,9 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
       out += 16;
       continue;
     }
-    unsigned lead = static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi8(_mm_max_epu8(x, c0), x)));
-    unsigned three = static_cast<unsigned>(_mm_movemask_epi8(_mm_cmpeq_epi8(_mm_max_epu8(x, e0), x)));
+    // Bits 6 and 5 of each byte, moved up to the sign: with bit 7, 11x is a lead, 111 of three.
+    unsigned lead = high & static_cast<unsigned>(_mm_movemask_epi8(_mm_slli_epi16(x, 1)));
+    unsigned three = lead & static_cast<unsigned>(_mm_movemask_epi8(_mm_slli_epi16(x, 2)));
     unsigned cont = high & ~lead;
     if ((((lead << 1) | (three << 2)) ^ cont) & 0xFFFF) break;
     unsigned cut = lead >> 15 ? 15 : (three >> 14) & 1 ? 14 : 16;
