@@ -8,6 +8,7 @@
 // the family, the streaming engine included, is `pump` over one such pair.
 #pragma once
 #include <algorithm>
+#include <bit>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
@@ -124,6 +125,17 @@ struct SbReader {
         plain = 0;
     }
     return plain;
+  }
+  // The bytes that do not decode to themselves all lie in [winLo, winLo + winSpan).
+  unsigned winLo = ~0u, winSpan = 0;
+  // True when that window leaves ASCII out and is not empty.
+  bool window() requires requires { d.sb; } {
+    if (winLo == ~0u) {
+      unsigned hi;
+      simd::unlikeSpan(d.sb, winLo, hi);
+      winSpan = hi > winLo ? hi - winLo : 0;
+    }
+    return winLo >= 0x80 && winSpan;
   }
 };
 
@@ -481,6 +493,109 @@ struct WWriter {
   }
 };
 
+// ---- Blocks of mixed text -------------------------------------------------------------
+// Pairs with a block loop convert many characters a step (simd.h) and leave what a step
+// does not take to the character loop. blocksOn says once per call whether the pages
+// allow it.
+
+// Single-byte pages. Where ASCII decodes to itself, widen and patch the bytes of the
+// window from the table (in Western pages a few control positions, or the upper half);
+// elsewhere (EBCDIC) table shuffles, or eight table loads a step.
+template <class D>
+inline bool blocksOn(SbReader<D> &r, U16Writer &) requires requires { r.d.sb; } {
+  r.window();
+  return r.winSpan != 0;
+}
+template <class D>
+inline size_t blocks(SbReader<D> &r, U16Writer &w, size_t n) requires requires { r.d.sb; } {
+  size_t i = 0;
+  if (r.window()) {
+    const auto lo = static_cast<uint8_t>(r.winLo), span = static_cast<uint8_t>(r.winSpan);
+    for (; i + 16 <= n; i += 16)
+      for (unsigned m = simd::widenBlock(r.p + i, w.o + i, lo, span); m; m &= m - 1) {
+        unsigned j = static_cast<unsigned>(__builtin_ctz(m));
+        w.o[i + j] = static_cast<VLUChar>(r.d.one(r.p[i + j]));
+      }
+  } else {
+    const uint8_t *p = r.p;
+    VLUChar *o = w.o;
+    const D d = r.d;
+    i = simd::mapBytes(p, o, n, d.sb);
+    for (; i + 8 <= n; i += 8)
+      for (unsigned j = 0; j < 8; ++j) o[i + j] = static_cast<VLUChar>(d.one(p[i + j]));
+  }
+  r.p += i;
+  w.o += i;
+  return i;
+}
+
+// To a single-byte page. Where ASCII is plain but not all of 0x00-0xFF, narrow and patch
+// the other units through the encoder; where the page's first index block is a full table
+// (EBCDIC), units below 0x100 take a load each, eight a step. A unit that takes more than
+// one byte ends the step.
+inline const uint8_t *firstBlock(const IndexEnc &e) {
+  const uint8_t *x = e.index;
+  if (!e.low || x[0] != 0 || x[1] != 0xFF || x[2] != 0 || x[3] != 0xFF) return nullptr;
+  return e.low + rd16(x + 4);
+}
+inline bool blocksOn(U16Reader &, ByteWriter<IndexEnc> &w) {
+  return cp::maxLen(w.enc.cp) == 1 && (w.plainBelow() == 0x80 || (w.plainBelow() == 0 && firstBlock(w.enc)));
+}
+inline size_t blocks(U16Reader &r, ByteWriter<IndexEnc> &w, size_t n) {
+  const VLUChar *u = r.p;
+  uint8_t *o = w.o;
+  // Through the encoder: false when the unit takes more than one byte.
+  auto one = [&](size_t at) {
+    uint8_t b[IndexEnc::kMax];
+    if (w.enc(u[at], b) != 1) return false;
+    o[at] = b[0];
+    return true;
+  };
+  auto steps = [&]() -> size_t {
+    size_t i = 0;
+    if (w.plainBelow() == 0x80) {
+      for (; i + 16 <= n; i += 16)
+        for (unsigned m = simd::narrowBlock(u + i, o + i, 0x80); m; m &= m - 1)
+          if (unsigned j = static_cast<unsigned>(__builtin_ctz(m)); !one(i + j)) return i + j;
+      return i;
+    }
+    const uint8_t *tab = firstBlock(w.enc);
+    for (; i + 8 <= n; i += 8) {
+      if ((u[i] | u[i + 1] | u[i + 2] | u[i + 3] | u[i + 4] | u[i + 5] | u[i + 6] | u[i + 7]) < 0x100) {
+        // One store for the eight: the loop stays on loads.
+        constexpr bool little = std::endian::native == std::endian::little;
+        uint64_t v = 0;
+        for (unsigned j = 0; j < 8; ++j) v |= uint64_t{tab[u[i + j]]} << (little ? 8 * j : 56 - 8 * j);
+        std::memcpy(o + i, &v, 8);
+        continue;
+      }
+      for (unsigned j = 0; j < 8; ++j)
+        if (!one(i + j)) return i + j;
+    }
+    return i;
+  };
+  size_t i = steps();
+  r.p += i;
+  w.o += i;
+  return i;
+}
+
+// UTF-8 and UTF-16 both ways, where the page's ASCII is plain.
+inline bool blocksOn(MbReader<Utf8Len, Utf8Uni> &r, U16Writer &) { return r.plainBelow() >= 0x80; }
+inline size_t blocks(MbReader<Utf8Len, Utf8Uni> &r, U16Writer &w, size_t n) {
+  simd::Moved m = simd::utf8ToUtf16(r.p, w.o, n);
+  r.p += m.in;
+  w.o += m.out;
+  return m.out;
+}
+inline bool blocksOn(U16Reader &, ByteWriter<Utf8Enc> &) { return true; }
+inline size_t blocks(U16Reader &r, ByteWriter<Utf8Enc> &w, size_t n) {
+  simd::Moved m = simd::utf16ToUtf8(r.p, w.o, n);
+  r.p += m.in;
+  w.o += m.out;
+  return m.in;
+}
+
 // ---- The loop -----------------------------------------------------------------------
 // Converts until the input ends (Done), a character is cut short (Partial, left unread)
 // or the output or the character limit is reached (Full: the character read is in held).
@@ -495,8 +610,25 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
       W lw = w;
       size_t i = 0;
       unsigned lim = 0;
+      bool blocked = false;
+      if constexpr (requires { blocks(lr, lw, n); }) {
+        if (n >= 32 && blocksOn(lr, lw)) {
+          blocked = true;
+          while (i < n) {
+            i += blocks(lr, lw, n - i);
+            // Where a step stopped, a stretch one by one, then steps again.
+            size_t m = std::min<size_t>(n - i, 16);
+            for (size_t j = 0; j < m; ++j) {
+              Value v;
+              (void)lr.fast(v);  // these readers never refuse
+              lw.fast(v);
+            }
+            i += m;
+          }
+        }
+      }
       if constexpr (requires { plainCopy(lr.p, lw.o, n, 0u); }) {
-        if (n >= 32) lim = std::min(lr.plainBelow(), lw.plainBelow());
+        if (n >= 32 && !blocked) lim = std::min(lr.plainBelow(), lw.plainBelow());
         // Runs pay only where every byte is plain: in other pages the runs of real text
         // are shorter than a block, and the table loop below is faster there.
         if (lim < 0x100) lim = 0;
