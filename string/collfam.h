@@ -308,14 +308,31 @@ struct Quick {
   const VLObjEntry *so = nullptr;
   const void *body = nullptr;
   const VLCodePage *page = nullptr;
+  const uint8_t *lenTab = nullptr;  // the plain form's, null in a single-byte page
   uint32_t unloads = 0;
   bool backward = false;
+  bool utf8 = false;
   uint64_t startBlocks[4] = {};  // high bytes in which some combination starts
+  uint64_t lowStarts[4] = {};    // units below 0x100 that start one
   uint16_t byByte[256] = {};     // one-byte characters of the page, and W values below 0x100
   uint16_t byUnit[256] = {};     // UTF-16 units
+  uint16_t byLead[256] = {};     // byByte for the bytes the plain form reads as whole characters
 
+  // The table's answer for a string's first unit, kLookUp when it has none.
+  // Two-byte UTF-8 below U+0100 reads through the unit table.
+  template <class F>
+  uint16_t first(F, const U<F> *p, uint32_t n) const {
+    if constexpr (F::kShift) return kLookUp;
+    if constexpr (!F::kUnits) {
+      if (utf8 && (*p & 0xFE) == 0xC2 && n >= 2) return byUnit[(*p & 0x03) << 6 | (p[1] & 0x3F)];
+      return byLead[*p];
+    }
+    if (*p >= 0x100) return kLookUp;
+    return (sizeof(U<F>) == 2 ? byUnit : byByte)[*p];
+  }
   static bool forwardPrimary(uint16_t flags) { return ((flags & sort::kClassMask) >> 10) & sort::kFwdPrimary; }
   bool starts(uint16_t u) const {
+    if (u < 0x100) return (lowStarts[u >> 6] >> (u & 63)) & 1;
     return ((startBlocks[u >> 14] >> ((u >> 8) & 63)) & 1) && sort::startsCombination(so, u);
   }
   uint16_t entryOf(uint16_t u) const {
@@ -324,15 +341,17 @@ struct Quick {
     const int n = sort::weightsOf(so, u, &w);
     return n == 2 ? kLookUp : n == 1 ? w.e[0].primary : 0;
   }
-  void build(const VLObjEntry *sortObj, const void *b, const VLCodePage *c, uint32_t gen) {
-    so = sortObj, body = b, page = c, unloads = gen;
+  void build(const VLObjEntry *sortObj, const void *b, const VLCodePage *c, const uint8_t *lens, uint32_t gen) {
+    so = sortObj, body = b, page = c, lenTab = lens, unloads = gen;
+    utf8 = cp::isUtf8(c);
     backward = false;
     const auto *bd = static_cast<const uint8_t *>(b);
-    for (uint64_t &w : startBlocks) w = 0;
+    for (uint32_t i = 0; i < 4; ++i) startBlocks[i] = lowStarts[i] = 0;
     const uint8_t *comb = bd + rd16(bd + sort::kCombOff);
     for (uint32_t i = 0, n = rd16(bd + sort::kCombCount); i < n; ++i) {
       const uint16_t u = rd16(comb + sort::kCombSize * i);
       startBlocks[u >> 14] |= uint64_t{1} << ((u >> 8) & 63);
+      if (u < 0x100) lowStarts[u >> 6] |= uint64_t{1} << (u & 63);
       const uint16_t f = rd16(comb + sort::kCombSize * i + 8);
       if (!(f & sort::kFourth) && rd16(comb + sort::kCombSize * i + 4) && !forwardPrimary(f)) backward = true;
     }
@@ -357,6 +376,7 @@ struct Quick {
     }
     for (uint32_t v = 0; v < 256; ++v) {
       byByte[v] = entryOf(cp::sbcsUni(c, static_cast<uint8_t>(v)));
+      byLead[v] = !lens || lens[v] == 1 ? byByte[v] : kLookUp;
       byUnit[v] = entryOf(static_cast<uint16_t>(v));
     }
   }
@@ -367,14 +387,19 @@ struct Quick {
 inline const Quick &quickOf(const VLLocale *l) {
   constexpr unsigned kKept = 4;
   static thread_local Quick kept[kKept];
-  static thread_local unsigned victim = 0;
+  static thread_local unsigned victim = 0, last = 0;
   const uint32_t gen = store::unloads.load(std::memory_order_acquire);
   const void *b = __atomic_load_n(&l->sort->section[0], __ATOMIC_ACQUIRE);
-  for (const Quick &q : kept)
-    if (q.so == l->sort && q.body == b && q.page == l->codePage && q.unloads == gen) return q;
-  Quick &q = kept[victim++ % kKept];
-  q.build(l->sort, b, l->codePage, gen);
-  return q;
+  const uint8_t *lens = bytesOf(l).lenTab;
+  auto fits = [&](const Quick &q) {
+    return q.so == l->sort && q.body == b && q.page == l->codePage && q.lenTab == lens && q.unloads == gen;
+  };
+  if (fits(kept[last])) return kept[last];
+  for (unsigned i = 0; i < kKept; ++i)
+    if (fits(kept[i])) return kept[last = i];
+  last = victim++ % kKept;
+  kept[last].build(l->sort, b, l->codePage, lens, gen);
+  return kept[last];
 }
 
 // The primary weights of one string, one at a time: one-unit characters below 0x100
@@ -386,7 +411,7 @@ struct Primaries {
   uint16_t second = 0;  // primary of an expansion's second element
 
   // The next primary weight; 0 at the end.
-  uint16_t next() {
+  [[gnu::always_inline]] uint16_t next() {
     if (second) return std::exchange(second, 0);
     for (;;) {
       if (src.pending == kNoUnit) {
@@ -401,10 +426,13 @@ struct Primaries {
         uint16_t k = kLookUp;
         if constexpr (F::kUnits) {
           if (*src.p < 0x100) k = (sizeof(U<F>) == 2 ? q.byUnit : q.byByte)[*src.p];
-        } else {
+        } else if constexpr (F::kShift) {
           n = src.f.len(src.p);
           if (n > src.rem) return 0;
           if (n == 1) k = q.byByte[*src.p];
+        } else {
+          k = q.first(src.f, src.p, src.rem);
+          n = q.utf8 && *src.p >= 0xC2 ? 2 : 1;  // only C2 and C3 get past kLookUp there
         }
         if (k != kLookUp) {
           src.p += n;
@@ -414,26 +442,30 @@ struct Primaries {
         }
       }
       if (src.done()) return 0;
-      Weights w;
-      uint16_t pos;
-      int n;
-      uint16_t u;
-      uint32_t len;
-      // A character that starts no combination needs no look-ahead.
-      if (src.pending == kNoUnit && !q.starts(src.peek(&u, &len))) {
-        src.p += len;
-        src.rem -= len;
-        n = sort::weightsOf(src.so, u, &w);
-      } else {
-        n = src.next(&w, &pos);
-      }
-      const uint16_t p0 = n ? w.e[0].primary : 0, p1 = n == 2 ? w.e[1].primary : 0;
-      if (p0) {
-        second = p1;
-        return p0;
-      }
-      if (p1) return p1;
+      if (const uint16_t k = lookUp()) return k;
     }
+  }
+
+  // The primary of the next element through the sort's tables, 0 when it has none.
+  [[gnu::noinline]] uint16_t lookUp() {
+    Weights w;
+    int n;
+    uint16_t u;
+    uint32_t len;
+    // A character that starts no combination needs no look-ahead; one of several bytes
+    // may still be a unit of the table.
+    if (src.pending == kNoUnit && !q.starts(src.peek(&u, &len))) {
+      src.p += len;
+      src.rem -= len;
+      if (u < 0x100 && q.byUnit[u] != kLookUp) return q.byUnit[u];
+      n = sort::weightsOf(src.so, u, &w);
+    } else {
+      uint16_t pos;
+      n = src.next(&w, &pos);
+    }
+    const uint16_t p0 = n ? w.e[0].primary : 0, p1 = n == 2 ? w.e[1].primary : 0;
+    if (p0) second = p1;
+    return p0 ? p0 : p1;
   }
 };
 
@@ -483,7 +515,7 @@ uint32_t commonStart(const Quick &q, const VLCodePage *c, F &fa, const U<F> *a, 
 
 // The order of the first primary difference, or 2 when every primary is equal.
 template <class F>
-int comparePrimaries(Primaries<F> a, Primaries<F> b) {
+[[gnu::always_inline]] inline int comparePrimaries(Primaries<F> &a, Primaries<F> &b) {
   for (;;) {
     const uint16_t pa = a.next(), pb = b.next();
     if (pa != pb) return pa < pb ? -1 : 1;
@@ -500,7 +532,7 @@ namespace vl::coll {
 inline bool optionsOk(uint32_t o) { return o == 0 || o == kIgnoreCase || o == kIgnoreWidth; }
 
 template <class F>
-uint32_t unitLen(F f, const U<F> *s, int32_t len, uint32_t opts) {
+[[gnu::always_inline]] inline uint32_t unitLen(F f, const U<F> *s, int32_t len, uint32_t opts) {
   if (len < 0) return length(s);
   if ((opts & VL_OPT_CHARLEN) && !F::kUnits) return unitsOf(f, s, static_cast<uint32_t>(len));
   return static_cast<uint32_t>(len);
@@ -634,10 +666,16 @@ int coll(VLLocale *l, F fa, const U<F> *a, int32_t alen, F fb, const U<F> *b, in
   }
   const Quick &q = quickOf(l);
   if (!q.backward) {
+    // Most pairs differ in their first characters already.
+    if (an && bn) {
+      const uint16_t ka = q.first(fa, a, an), kb = q.first(fb, b, bn);
+      if (ka != kb && ka && kb && ka != kLookUp && kb != kLookUp) return ka < kb ? -1 : 1;
+    }
     F at = fa;  // the state where both walks start
     const uint32_t k = commonStart(q, l->codePage, at, a, an, fb, b, bn);
-    const int r = comparePrimaries(Primaries<F>{{at, l->codePage, l->sort, a + k, an - k}, q},
-                                   Primaries<F>{{k ? at : fb, l->codePage, l->sort, b + k, bn - k}, q});
+    Primaries<F> pa{{at, l->codePage, l->sort, a + k, an - k}, q};
+    Primaries<F> pb{{k ? at : fb, l->codePage, l->sort, b + k, bn - k}, q};
+    const int r = comparePrimaries(pa, pb);
     if (r != 2) return r;
   }
   return compareLevels(l, fa, a, an, fb, b, bn, (opts & kIgnoreCase) == kIgnoreCase);
