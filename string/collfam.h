@@ -384,22 +384,35 @@ struct Quick {
 
 // Building walks the sort's tables, so each thread keeps the last few and rebuilds one
 // when the sort, its body, the code page or the store's unload count changes.
-inline const Quick &quickOf(const VLLocale *l) {
+struct QuickKey {
+  const VLObjEntry *so;
+  const void *body;
+  const VLCodePage *page;
+  const uint8_t *lenTab;
+  uint32_t unloads;
+  bool operator==(const QuickKey &) const = default;
+};
+[[gnu::noinline]] inline const Quick *quickFind(const QuickKey &k) {
   constexpr unsigned kKept = 4;
   static thread_local Quick kept[kKept];
-  static thread_local unsigned victim = 0, last = 0;
-  const uint32_t gen = store::unloads.load(std::memory_order_acquire);
-  const void *b = __atomic_load_n(&l->sort->section[0], __ATOMIC_ACQUIRE);
-  const uint8_t *lens = bytesOf(l).lenTab;
-  auto fits = [&](const Quick &q) {
-    return q.so == l->sort && q.body == b && q.page == l->codePage && q.lenTab == lens && q.unloads == gen;
-  };
-  if (fits(kept[last])) return kept[last];
-  for (unsigned i = 0; i < kKept; ++i)
-    if (fits(kept[i])) return kept[last = i];
-  last = victim++ % kKept;
-  kept[last].build(l->sort, b, l->codePage, lens, gen);
-  return kept[last];
+  static thread_local unsigned victim = 0;
+  for (Quick &q : kept)
+    if (QuickKey{q.so, q.body, q.page, q.lenTab, q.unloads} == k) return &q;
+  Quick &q = kept[victim++ % kKept];
+  q.build(k.so, k.body, k.page, k.lenTab, k.unloads);
+  return &q;
+}
+// The last one found sits beside its key, so a repeated call only compares.
+inline const Quick &quickOf(const VLLocale *l) {
+  static thread_local QuickKey lastKey{};
+  static thread_local const Quick *last = nullptr;
+  const QuickKey k{l->sort, __atomic_load_n(&l->sort->section[0], __ATOMIC_ACQUIRE), l->codePage,
+                   bytesOf(l).lenTab, store::unloads.load(std::memory_order_acquire)};
+  if (!last || !(k == lastKey)) {
+    last = quickFind(k);
+    lastKey = k;
+  }
+  return *last;
 }
 
 // The primary weights of one string, one at a time: one-unit characters below 0x100
