@@ -437,15 +437,13 @@ struct Primaries {
         if (!src.rem) return 0;
         uint32_t n = 1;
         uint16_t k = kLookUp;
-        if constexpr (F::kUnits) {
-          if (*src.p < 0x100) k = (sizeof(U<F>) == 2 ? q.byUnit : q.byByte)[*src.p];
-        } else if constexpr (F::kShift) {
+        if constexpr (F::kShift) {
           n = src.f.len(src.p);
           if (n > src.rem) return 0;
           if (n == 1) k = q.byByte[*src.p];
         } else {
           k = q.first(src.f, src.p, src.rem);
-          n = q.utf8 && *src.p >= 0xC2 ? 2 : 1;  // only C2 and C3 get past kLookUp there
+          if (!F::kUnits && q.utf8 && *src.p >= 0xC2) n = 2;  // only C2 and C3 get past kLookUp there
         }
         if (k != kLookUp) {
           src.p += n;
