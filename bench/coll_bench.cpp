@@ -1,5 +1,5 @@
 // Collation speed: VLStrcoll and VLStrxfrm against the C library's strcoll_l/strxfrm_l
-// and ICU's ucol_strcollUTF8/ucol_getSortKey, Swedish, on the same random word pairs in
+// and ICU's ucol_strcollUTF8/ucol_strcoll/ucol_getSortKey, Swedish, on the same random word pairs in
 // the same run (items_per_second = comparisons or keys per second). The C library's
 // locale comes from the tests' localedef cache beside the definitions directory.
 #include <benchmark/benchmark.h>
@@ -96,6 +96,46 @@ void collIcu(benchmark::State &st) {
   st.SetItemsProcessed(static_cast<int64_t>(st.iterations() * (w.size() - 1)));
 }
 
+// The same words as UTF-16, converted once outside the timing.
+const std::vector<std::u16string> &words16() {
+  static const std::vector<std::u16string> u = [] {
+    std::vector<std::u16string> out;
+    for (const std::string &s : words()) {
+      UChar b[64];
+      int32_t n = 0;
+      UErrorCode err = U_ZERO_ERROR;
+      u_strFromUTF8(b, 64, &n, s.data(), static_cast<int32_t>(s.size()), &err);
+      out.emplace_back(reinterpret_cast<const char16_t *>(b), static_cast<size_t>(n));
+    }
+    return out;
+  }();
+  return u;
+}
+
+void collOursU(benchmark::State &st) {
+  const auto &w = words16();
+  if (!ours() || !ours()->sort) return st.SkipWithError("no Swedish sort generated");
+  for (auto _ : st)
+    for (size_t i = 0; i + 1 < w.size(); ++i)
+      benchmark::DoNotOptimize(VLStrcollU(ours(), reinterpret_cast<const VLUChar *>(w[i].data()),
+                                          static_cast<int32_t>(w[i].size()),
+                                          reinterpret_cast<const VLUChar *>(w[i + 1].data()),
+                                          static_cast<int32_t>(w[i + 1].size()), 0));
+  st.SetItemsProcessed(static_cast<int64_t>(st.iterations() * (w.size() - 1)));
+}
+
+void collIcuU(benchmark::State &st) {
+  const auto &w = words16();
+  if (!icu()) return st.SkipWithError("ICU has no Swedish collator");
+  for (auto _ : st)
+    for (size_t i = 0; i + 1 < w.size(); ++i)
+      benchmark::DoNotOptimize(ucol_strcoll(icu(), reinterpret_cast<const UChar *>(w[i].data()),
+                                            static_cast<int32_t>(w[i].size()),
+                                            reinterpret_cast<const UChar *>(w[i + 1].data()),
+                                            static_cast<int32_t>(w[i + 1].size())));
+  st.SetItemsProcessed(static_cast<int64_t>(st.iterations() * (w.size() - 1)));
+}
+
 void keyOurs(benchmark::State &st) {
   const auto &w = words();
   if (!ours() || !ours()->sort) return st.SkipWithError("no Swedish sort generated");
@@ -115,18 +155,11 @@ void keyC(benchmark::State &st) {
   st.SetItemsProcessed(static_cast<int64_t>(st.iterations() * w.size()));
 }
 
-// ICU keys UTF-16 only: the words are converted once, outside the timing.
+// ICU keys UTF-16 only.
 void keyIcu(benchmark::State &st) {
   const auto &w = words();
   if (!icu()) return st.SkipWithError("ICU has no Swedish collator");
-  std::vector<std::u16string> u;
-  for (const std::string &s : w) {
-    UChar b[64];
-    int32_t n = 0;
-    UErrorCode err = U_ZERO_ERROR;
-    u_strFromUTF8(b, 64, &n, s.data(), static_cast<int32_t>(s.size()), &err);
-    u.emplace_back(reinterpret_cast<const char16_t *>(b), static_cast<size_t>(n));
-  }
+  const auto &u = words16();
   uint8_t k[512];
   for (auto _ : st)
     for (const std::u16string &s : u)
@@ -138,6 +171,8 @@ void keyIcu(benchmark::State &st) {
 BENCHMARK(collOurs)->Name("Swedish strcoll/veltrin");
 BENCHMARK(collC)->Name("Swedish strcoll/clib");
 BENCHMARK(collIcu)->Name("Swedish strcoll/icu");
+BENCHMARK(collOursU)->Name("Swedish strcoll UTF-16/veltrin");
+BENCHMARK(collIcuU)->Name("Swedish strcoll UTF-16/icu");
 BENCHMARK(keyOurs)->Name("Swedish sortkey/veltrin");
 BENCHMARK(keyC)->Name("Swedish sortkey/clib");
 BENCHMARK(keyIcu)->Name("Swedish sortkey/icu");

@@ -5,8 +5,11 @@
 #include <cstdint>
 #include <cstring>
 #include <iterator>
+#include <utility>
 
 #include "codepage/step.h"
+#include "store/store.h"
+#include "string/compare.h"
 #include "string/sortbody.h"
 
 namespace vl::coll {
@@ -146,25 +149,30 @@ struct Source {
       }
     }
     if (!rem) return false;
-    if constexpr (F::kUnits) {
-      if constexpr (sizeof(U<F>) == 2)
-        *u = *p;
-      else
-        *u = *p < 0x100 ? cp::sbcsUni(cp, static_cast<uint8_t>(*p)) : cp::wToUni(cp, *p);
-      *len = 1;
-    } else {
-      const uint32_t n = f.len(p);
-      if (n > rem) {
-        rem = 0;
-        return false;
-      }
-      *u = n == 1 ? cp::sbcsUni(cp, *p) : cp::mbToUni(cp, p, n);
-      *len = n;
+    if (f.len(p) > rem) {
+      rem = 0;
+      return false;
     }
+    peek(u, len);
     p += *len;
     rem -= *len;
     ++counter;
     return true;
+  }
+
+  // The unit of the whole character at p (rem is not 0 and it fits), and its length.
+  uint16_t peek(uint16_t *u, uint32_t *len) const {
+    if constexpr (F::kUnits) {
+      *len = 1;
+      if constexpr (sizeof(U<F>) == 2)
+        *u = *p;
+      else
+        *u = *p < 0x100 ? cp::sbcsUni(cp, static_cast<uint8_t>(*p)) : cp::wToUni(cp, *p);
+    } else {
+      *len = f.len(p);
+      *u = *len == 1 ? cp::sbcsUni(cp, *p) : cp::mbToUni(cp, p, *len);
+    }
+    return *u;
   }
 
   // The next element (0 = none: ignorable, or the end when done() says so). pos gets the
@@ -285,6 +293,247 @@ int compareWalk(Source<F> a, Source<F> b, Levels &la, Levels &lb) {
   return compare(la, lb);
 }
 
+// ---- The shortcut of typical comparisons --------------------------------------------
+// Most pairs differ in a primary weight near their first difference. For sorts that place
+// every primary forward, the walk starts past the common beginning of both strings and
+// decides at the first primary difference without placing a weight; only pairs whose
+// primaries are all equal take the full walk over the level buffers.
+
+constexpr uint16_t kLookUp = 0xFFFF;  // a character the table cannot answer alone
+
+// Per sort and code page: the primary weight of each one-unit character below 0x100
+// (0 = none, kLookUp = it expands, starts a combination or weighs 0xFFFF), and whether
+// any primary is placed backward (then no shortcut holds).
+struct Quick {
+  const VLObjEntry *so = nullptr;
+  const void *body = nullptr;
+  const VLCodePage *page = nullptr;
+  const uint8_t *lenTab = nullptr;  // the plain form's, null in a single-byte page
+  uint32_t unloads = 0;
+  bool backward = false;
+  bool utf8 = false;
+  uint64_t startBlocks[4] = {};  // high bytes in which some combination starts
+  uint64_t lowStarts[4] = {};    // units below 0x100 that start one
+  uint16_t byByte[256] = {};     // one-byte characters of the page, and W values below 0x100
+  uint16_t byUnit[256] = {};     // UTF-16 units
+  uint16_t byLead[256] = {};     // byByte for the bytes the plain form reads as whole characters
+
+  // The table's answer for a string's first unit, kLookUp when it has none.
+  // Two-byte UTF-8 below U+0100 reads through the unit table.
+  template <class F>
+  uint16_t first(F, const U<F> *p, uint32_t n) const {
+    if constexpr (F::kShift) return kLookUp;
+    if constexpr (!F::kUnits) {
+      if (utf8 && (*p & 0xFE) == 0xC2 && n >= 2) return byUnit[(*p & 0x03) << 6 | (p[1] & 0x3F)];
+      return byLead[*p];
+    }
+    if (*p >= 0x100) return kLookUp;
+    return (sizeof(U<F>) == 2 ? byUnit : byByte)[*p];
+  }
+  static bool forwardPrimary(uint16_t flags) { return ((flags & sort::kClassMask) >> 10) & sort::kFwdPrimary; }
+  bool starts(uint16_t u) const {
+    if (u < 0x100) return (lowStarts[u >> 6] >> (u & 63)) & 1;
+    return ((startBlocks[u >> 14] >> ((u >> 8) & 63)) & 1) && sort::startsCombination(so, u);
+  }
+  uint16_t entryOf(uint16_t u) const {
+    if (starts(u)) return kLookUp;
+    Weights w;
+    const int n = sort::weightsOf(so, u, &w);
+    return n == 2 ? kLookUp : n == 1 ? w.e[0].primary : 0;
+  }
+  void build(const VLObjEntry *sortObj, const void *b, const VLCodePage *c, const uint8_t *lens, uint32_t gen) {
+    so = sortObj, body = b, page = c, lenTab = lens, unloads = gen;
+    utf8 = cp::isUtf8(c);
+    backward = false;
+    const auto *bd = static_cast<const uint8_t *>(b);
+    for (uint32_t i = 0; i < 4; ++i) startBlocks[i] = lowStarts[i] = 0;
+    const uint8_t *comb = bd + rd16(bd + sort::kCombOff);
+    for (uint32_t i = 0, n = rd16(bd + sort::kCombCount); i < n; ++i) {
+      const uint16_t u = rd16(comb + sort::kCombSize * i);
+      startBlocks[u >> 14] |= uint64_t{1} << ((u >> 8) & 63);
+      if (u < 0x100) lowStarts[u >> 6] |= uint64_t{1} << (u & 63);
+      const uint16_t f = rd16(comb + sort::kCombSize * i + 8);
+      if (!(f & sort::kFourth) && rd16(comb + sort::kCombSize * i + 4) && !forwardPrimary(f)) backward = true;
+    }
+    // Every weight table entry a block reaches, and the arithmetic primary blocks.
+    const uint8_t *table = bd + rd16(bd + sort::kWeightOff);
+    uint32_t lastBase = UINT32_MAX;
+    for (uint32_t hi = 0; hi < 256 && !backward; ++hi) {
+      const uint8_t *blk = bd + sort::kBlocks + 4 * hi;
+      if (blk[0] & sort::kBlockIgnore) continue;
+      if (blk[0] & sort::kBlockPrimary) {
+        backward = !(blk[1] & sort::kFwdPrimary);
+        continue;
+      }
+      if ((blk[0] & sort::kBlockFourth) || rd16(blk + 2) == lastBase) continue;
+      lastBase = rd16(blk + 2);
+      for (uint32_t lo = 0; lo < 256 && !backward; ++lo) {
+        const uint8_t *e = table + sort::kWeightSize * static_cast<uint16_t>(lastBase + lo);
+        const uint16_t f = rd16(e + 4);
+        const bool primary = (f & sort::kExpands) || (!(f & sort::kFourth) && rd16(e));
+        backward = primary && !forwardPrimary(f);
+      }
+    }
+    for (uint32_t v = 0; v < 256; ++v) {
+      byByte[v] = entryOf(cp::sbcsUni(c, static_cast<uint8_t>(v)));
+      byLead[v] = !lens || lens[v] == 1 ? byByte[v] : kLookUp;
+      byUnit[v] = entryOf(static_cast<uint16_t>(v));
+    }
+  }
+};
+
+// Building walks the sort's tables, so each thread keeps the last few and rebuilds one
+// when the sort, its body, the code page or the store's unload count changes.
+struct QuickKey {
+  const VLObjEntry *so;
+  const void *body;
+  const VLCodePage *page;
+  const uint8_t *lenTab;
+  uint32_t unloads;
+  bool operator==(const QuickKey &) const = default;
+};
+[[gnu::noinline]] inline const Quick *quickFind(const QuickKey &k) {
+  constexpr unsigned kKept = 4;
+  static thread_local Quick kept[kKept];
+  static thread_local unsigned victim = 0;
+  for (Quick &q : kept)
+    if (QuickKey{q.so, q.body, q.page, q.lenTab, q.unloads} == k) return &q;
+  Quick &q = kept[victim++ % kKept];
+  q.build(k.so, k.body, k.page, k.lenTab, k.unloads);
+  return &q;
+}
+// The last one found sits beside its key, so a repeated call only compares.
+inline const Quick &quickOf(const VLLocale *l) {
+  static thread_local QuickKey lastKey{};
+  static thread_local const Quick *last = nullptr;
+  const QuickKey k{l->sort, __atomic_load_n(&l->sort->section[0], __ATOMIC_ACQUIRE), l->codePage,
+                   bytesOf(l).lenTab, store::unloads.load(std::memory_order_acquire)};
+  if (!last || !(k == lastKey)) {
+    last = quickFind(k);
+    lastKey = k;
+  }
+  return *last;
+}
+
+// The primary weights of one string, one at a time: one-unit characters below 0x100
+// through the table, everything else through the full element walk.
+template <class F>
+struct Primaries {
+  Source<F> src;
+  const Quick &q;
+  uint16_t second = 0;  // primary of an expansion's second element
+
+  // The next primary weight; 0 at the end.
+  [[gnu::always_inline]] uint16_t next() {
+    if (second) return std::exchange(second, 0);
+    for (;;) {
+      if (src.pending == kNoUnit) {
+        if constexpr (F::kShift) {
+          while (src.rem && src.f.isShift(*src.p)) {
+            src.f.shift(*src.p++);
+            --src.rem;
+          }
+        }
+        if (!src.rem) return 0;
+        uint32_t n = 1;
+        uint16_t k = kLookUp;
+        if constexpr (F::kShift) {
+          n = src.f.len(src.p);
+          if (n > src.rem) return 0;
+          if (n == 1) k = q.byByte[*src.p];
+        } else {
+          k = q.first(src.f, src.p, src.rem);
+          if (!F::kUnits && q.utf8 && *src.p >= 0xC2) n = 2;  // only C2 and C3 get past kLookUp there
+        }
+        if (k != kLookUp) {
+          src.p += n;
+          src.rem -= n;
+          if (k) return k;
+          continue;
+        }
+      }
+      if (src.done()) return 0;
+      if (const uint16_t k = lookUp()) return k;
+    }
+  }
+
+  // The primary of the next element through the sort's tables, 0 when it has none.
+  [[gnu::noinline]] uint16_t lookUp() {
+    Weights w;
+    int n;
+    uint16_t u;
+    uint32_t len;
+    // A character that starts no combination needs no look-ahead; one of several bytes
+    // may still be a unit of the table.
+    if (src.pending == kNoUnit && !q.starts(src.peek(&u, &len))) {
+      src.p += len;
+      src.rem -= len;
+      if (u < 0x100 && q.byUnit[u] != kLookUp) return q.byUnit[u];
+      n = sort::weightsOf(src.so, u, &w);
+    } else {
+      uint16_t pos;
+      n = src.next(&w, &pos);
+    }
+    const uint16_t p0 = n ? w.e[0].primary : 0, p1 = n == 2 ? w.e[1].primary : 0;
+    if (p0) second = p1;
+    return p0 ? p0 : p1;
+  }
+};
+
+// The unit count both strings share at their start, cut back to a boundary the walk of
+// either string also reaches: a whole character that does not start a combination. fa
+// gets the state there.
+template <class F>
+uint32_t commonStart(const Quick &q, const VLCodePage *c, F &fa, const U<F> *a, uint32_t an, F fb, const U<F> *b,
+                     uint32_t bn) {
+  if (fa.state != fb.state) return 0;
+  const uint32_t m = an < bn ? an : bn;
+  uint32_t d = 0;
+  while (d < m && a[d] == b[d]) ++d;
+  if (!d) return 0;
+  auto startsAt = [&](const U<F> *p, uint32_t n) {
+    if (n == 1 && static_cast<uint32_t>(*p) < 0x100) {
+      const uint16_t k = (F::kUnits && sizeof(U<F>) == 2 ? q.byUnit : q.byByte)[*p];
+      return k == kLookUp && q.starts(F::kUnits && sizeof(U<F>) == 2 ? *p : cp::sbcsUni(c, static_cast<uint8_t>(*p)));
+    }
+    if constexpr (F::kUnits)
+      return q.starts(sizeof(U<F>) == 2 ? static_cast<uint16_t>(*p) : cp::wToUni(c, *p));
+    else
+      return q.starts(cp::mbToUni(c, p, n));
+  };
+  if (F::kUnits || (!F::kShift && fa.singleByte())) {
+    while (d && startsAt(a + d - 1, 1)) --d;
+    return d;
+  }
+  // Character ends in order, with the state after each; the last few are kept to back up.
+  constexpr uint32_t kBack = 4;
+  uint32_t ends[kBack], states[kBack], lens[kBack], k = 0;
+  Walk<F> w{fa, a, d};
+  uint32_t at, len;
+  while (w.next(at, len)) {
+    ends[k % kBack] = at + len, states[k % kBack] = w.f.state, lens[k % kBack] = len;
+    ++k;
+  }
+  for (uint32_t i = 0; i < kBack && k; ++i, --k) {
+    const uint32_t j = (k - 1) % kBack;
+    if (!startsAt(a + ends[j] - lens[j], lens[j])) {
+      fa.state = states[j];
+      return ends[j];
+    }
+  }
+  return 0;
+}
+
+// The order of the first primary difference, or 2 when every primary is equal.
+template <class F>
+[[gnu::always_inline]] inline int comparePrimaries(Primaries<F> &a, Primaries<F> &b) {
+  for (;;) {
+    const uint16_t pa = a.next(), pb = b.next();
+    if (pa != pb) return pa < pb ? -1 : 1;
+    if (!pa) return 2;
+  }
+}
+
 }  // namespace vl::coll
 
 namespace vl::coll {
@@ -294,7 +543,7 @@ namespace vl::coll {
 inline bool optionsOk(uint32_t o) { return o == 0 || o == kIgnoreCase || o == kIgnoreWidth; }
 
 template <class F>
-uint32_t unitLen(F f, const U<F> *s, int32_t len, uint32_t opts) {
+[[gnu::always_inline]] inline uint32_t unitLen(F f, const U<F> *s, int32_t len, uint32_t opts) {
   if (len < 0) return length(s);
   if ((opts & VL_OPT_CHARLEN) && !F::kUnits) return unitsOf(f, s, static_cast<uint32_t>(len));
   return static_cast<uint32_t>(len);
@@ -314,11 +563,25 @@ int32_t binaryKey(uint8_t *dst, uint32_t dstLen, const T *s, uint32_t n) {
   }
   return static_cast<int32_t>(len);
 }
-template <class T>
-int binaryCompare(const T *a, uint32_t an, const T *b, uint32_t bn) {
-  for (uint32_t i = 0; i < an && i < bn; ++i)
-    if (a[i] != b[i]) return a[i] < b[i] ? -1 : 1;
-  return an == bn ? 0 : an < bn ? -1 : 1;
+
+// Equal primaries: the full walk over the four level buffers of both strings, in a work
+// area on the stack for typical words.
+template <class F>
+int compareLevels(VLLocale *l, F fa, const U<F> *a, uint32_t an, F fb, const U<F> *b, uint32_t bn, bool noTertiary) {
+  const uint32_t na = workSize(an ? an : 1), nb = workSize(bn ? bn : 1);
+  alignas(8) uint8_t stack[2048];
+  const bool onStack = na + nb <= sizeof stack;
+  Block<uint8_t> own(onStack ? nullptr : static_cast<uint8_t *>(alloc(na + nb)));
+  if (!onStack && !own) {
+    setRc(l, VL_RC_NOMEM);
+    return 0;
+  }
+  uint8_t *area = onStack ? stack : own.get();
+  Levels la, lb;
+  la.init(area, an ? an : 1);
+  lb.init(area + na, bn ? bn : 1);
+  la.noTertiary = lb.noTertiary = noTertiary;
+  return compareWalk(Source<F>{fa, l->codePage, l->sort, a, an}, Source<F>{fb, l->codePage, l->sort, b, bn}, la, lb);
 }
 
 template <class F>
@@ -354,39 +617,79 @@ int32_t xfrm(VLLocale *l, F f, uint8_t *dst, int32_t dstLen, const U<F> *src, in
   return k;
 }
 
-// Drops trailing blanks (and the ideographic one where units are Unicode).
-template <class F>
-uint32_t trimBlanks(const U<F> *s, uint32_t n) {
-  while (n && (s[n - 1] == 0x20 || (F::kUnits && s[n - 1] == 0x3000))) --n;
-  return n;
+// A locale without a sort orders by code: the comparison family, with the options
+// reduced as the family table says (W values know no width folding there).
+inline int byCode(VLLocale *l, Bytes, const uint8_t *a, uint32_t an, Bytes, const uint8_t *b, uint32_t bn,
+                  uint32_t o) {
+  return VLStrcmp(l, cb(a), static_cast<int32_t>(an), cb(b), static_cast<int32_t>(bn), o);
+}
+inline int byCode(VLLocale *l, Shifted fa, const uint8_t *a, uint32_t an, Shifted fb, const uint8_t *b,
+                  uint32_t bn, uint32_t o) {
+  return VLStrcmpEx(l, cb(a), fa.state, static_cast<int32_t>(an), cb(b), fb.state, static_cast<int32_t>(bn), o);
+}
+inline int byCode(VLLocale *l, WForm, const VLWChar *a, uint32_t an, WForm, const VLWChar *b, uint32_t bn,
+                  uint32_t o) {
+  return VLWcscmp(l, a, static_cast<int32_t>(an), b, static_cast<int32_t>(bn), o & 0x80200040u);
+}
+inline int byCode(VLLocale *l, UForm, const VLUChar *a, uint32_t an, UForm, const VLUChar *b, uint32_t bn,
+                  uint32_t o) {
+  return VLStrcmpU(l, a, static_cast<int32_t>(an), b, static_cast<int32_t>(bn), o);
+}
+inline uint32_t byCodeOptions(uint32_t o) {
+  return o & ((o & kIgnoreWidth) == kIgnoreWidth ? 0x80200041u : 0x80200040u);
 }
 
+// Trailing blanks leave both strings: in byte forms as truncation drops them (full-width
+// ones included), in W values the page's blank and, width-blind, its full-width form, in
+// UTF-16 U+0020 and U+3000.
+template <class F>
+void trimBlanks(VLLocale *l, F fa, const U<F> *a, uint32_t *an, F fb, const U<F> *b, uint32_t *bn, uint32_t opts) {
+  if constexpr (!F::kUnits) {
+    str::dropBlanks(l, fa, a, an, fb, b, bn, true);
+  } else {
+    uint32_t blank = 0x20, wide = 0x3000;
+    if constexpr (sizeof(U<F>) == 4) {
+      blank = cp::isAscii(l->codePage) ? 0x20 : 0x40;
+      wide = (opts & kIgnoreWidth) == kIgnoreWidth ? VLCpMbHalfToFullW(l->codePage, blank) : blank;
+    }
+    for (auto [s, n] : {std::pair{a, an}, std::pair{b, bn}})
+      while (*n && (s[*n - 1] == blank || s[*n - 1] == wide)) --*n;
+  }
+}
+
+// Bit 0x01 drops trailing blanks and then clears 0x00200000; the W form drops them on
+// 0x00200000 itself. What remains must be a collation option, else code 2 and 0.
 template <class F>
 int coll(VLLocale *l, F fa, const U<F> *a, int32_t alen, F fb, const U<F> *b, int32_t blen, uint32_t opts) {
   setRc(l, VL_RC_OK);
   if (!a || !b) return a ? 1 : b ? -1 : 0;
   uint32_t an = unitLen(fa, a, alen, opts), bn = unitLen(fb, b, blen, opts);
-  if (opts & 0x01) {
-    an = trimBlanks<F>(a, an);
-    bn = trimBlanks<F>(b, bn);
+  opts &= ~VL_OPT_CHARLEN;
+  if (!usesSort(l)) return byCode(l, fa, a, an, fb, b, bn, byCodeOptions(opts));
+  const uint32_t trigger = F::kUnits && sizeof(U<F>) == 4 ? VL_CMP_NOBLANKS : 0x01u;
+  if (opts & trigger) {
+    trimBlanks(l, fa, a, &an, fb, b, &bn, opts);
+    opts &= ~VL_CMP_NOBLANKS;
   }
-  const bool noTertiary = (opts & kIgnoreCase) == kIgnoreCase;
-  if (!usesSort(l)) return binaryCompare(a, an, b, bn);
-  const uint32_t na = workSize(an ? an : 1), nb = workSize(bn ? bn : 1);
-  // Typical words fit on the stack; only long strings take the allocation hook.
-  alignas(8) uint8_t stack[2048];
-  const bool onStack = na + nb <= sizeof stack;
-  Block<uint8_t> own(onStack ? nullptr : static_cast<uint8_t *>(alloc(na + nb)));
-  if (!onStack && !own) {
-    setRc(l, VL_RC_NOMEM);
+  if (!optionsOk(opts & ~0x01u)) {
+    setRc(l, VL_RC_BADARG);
     return 0;
   }
-  uint8_t *area = onStack ? stack : own.get();
-  Levels la, lb;
-  la.init(area, an ? an : 1);
-  lb.init(area + na, bn ? bn : 1);
-  la.noTertiary = lb.noTertiary = noTertiary;
-  return compareWalk(Source<F>{fa, l->codePage, l->sort, a, an}, Source<F>{fb, l->codePage, l->sort, b, bn}, la, lb);
+  const Quick &q = quickOf(l);
+  if (!q.backward) {
+    // Most pairs differ in their first characters already.
+    if (an && bn) {
+      const uint16_t ka = q.first(fa, a, an), kb = q.first(fb, b, bn);
+      if (ka != kb && ka && kb && ka != kLookUp && kb != kLookUp) return ka < kb ? -1 : 1;
+    }
+    F at = fa;  // the state where both walks start
+    const uint32_t k = commonStart(q, l->codePage, at, a, an, fb, b, bn);
+    Primaries<F> pa{{at, l->codePage, l->sort, a + k, an - k}, q};
+    Primaries<F> pb{{k ? at : fb, l->codePage, l->sort, b + k, bn - k}, q};
+    const int r = comparePrimaries(pa, pb);
+    if (r != 2) return r;
+  }
+  return compareLevels(l, fa, a, an, fb, b, bn, (opts & kIgnoreCase) == kIgnoreCase);
 }
 
 }  // namespace vl::coll

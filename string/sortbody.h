@@ -87,6 +87,19 @@ inline int weightsOf(const VLObjEntry *s, uint16_t unit, Weights *w) {
   return 1;
 }
 
+// True when some combination starts with u.
+inline bool startsCombination(const VLObjEntry *s, uint16_t u) {
+  const uint8_t *b = body(s);
+  const uint8_t *t = b + rd16(b + kCombOff);
+  const uint32_t n = rd16(b + kCombCount);
+  uint32_t lo = 0, hi = n;
+  while (lo < hi) {
+    const uint32_t mid = (lo + hi) / 2;
+    if (rd16(t + kCombSize * mid) < u) lo = mid + 1; else hi = mid;
+  }
+  return lo < n && rd16(t + kCombSize * lo) == u;
+}
+
 // 1 when the pair forms one element.
 inline int combinationOf(const VLObjEntry *s, uint16_t u1, uint16_t u2, Weights *w) {
   const uint8_t *b = body(s);

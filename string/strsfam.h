@@ -31,6 +31,11 @@ const U<F> *find(VLLocale *l, F f, const U<F> *str, int32_t len, F sf, const U<F
   const uint32_t n = units(f, str, len), m = units(sf, sub, subLen);
   if (m == 0) return str;
   if (m > n) return nullptr;
+  // The collation options the candidate spans are compared under (bit 0x01 drops trailing
+  // blanks there).
+  const uint32_t co = (opts & coll::kIgnoreWidth) == coll::kIgnoreWidth ? coll::kIgnoreWidth
+                      : (opts & coll::kIgnoreCase) == coll::kIgnoreCase ? coll::kIgnoreCase
+                                                                         : opts & 0x01u;
   // Candidates start at each character; exact matches also need the same shift state.
   Walk<F> w{f, str, n};
   uint32_t at, clen;
@@ -45,7 +50,7 @@ const U<F> *find(VLLocale *l, F f, const U<F> *str, int32_t len, F sf, const U<F
       continue;
     }
     const uint32_t span = at + m <= n ? m : n - at;
-    const int r = coll::coll(l, here, str + at, static_cast<int32_t>(span), sf, sub, static_cast<int32_t>(m), opts);
+    const int r = coll::coll(l, here, str + at, static_cast<int32_t>(span), sf, sub, static_cast<int32_t>(m), co);
     // A comparison that found no work area answers 0 without having compared.
     if (static_cast<uint32_t>(l->lastError) == VL_RC_NOMEM) return nullptr;
     if (r == 0) return str + at;

@@ -10,6 +10,7 @@
 #include <cstring>
 #include <filesystem>
 #include <memory>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -148,6 +149,32 @@ TEST_P(CollateOracle, AgreesWithTheCLibrary) {
       else if (differ.size() < 400) differ += " [" + words[i] + " " + words[j] + "]";
     }
   }
+  // Random pairs over the list's characters, sharing a beginning: the comparison orders
+  // them as their keys do.
+  std::vector<std::string> chars;
+  for (const std::string &w : words)
+    for (size_t i = 0; i < w.size();) {
+      const size_t n = (w[i] & 0x80) == 0 ? 1 : (w[i] & 0xE0) == 0xC0 ? 2 : 3;
+      chars.push_back(w.substr(i, n));
+      i += n;
+    }
+  std::mt19937 rng(5);
+  auto random = [&](size_t max) {
+    std::string s;
+    for (size_t n = rng() % (max + 1); n--;) s += chars[rng() % chars.size()];
+    return s;
+  };
+  auto key = [&](const std::string &w) {
+    std::string k(512, '\0');
+    k.resize(static_cast<size_t>(VLStrxfrm(l, k.data(), 512, w.data(), static_cast<int32_t>(w.size()), 0)));
+    return k;
+  };
+  for (int i = 0; i < 1500; ++i) {
+    const std::string head = random(4), a = head + random(5), b = head + random(5);
+    ASSERT_EQ(sign(VLStrcoll(l, a.data(), static_cast<int32_t>(a.size()), b.data(), static_cast<int32_t>(b.size()), 0)),
+              sign(key(a).compare(key(b))))
+        << a << " / " << b;
+  }
   const double share = 100.0 * static_cast<double>(alike) / static_cast<double>(pairs);
   std::printf("%-10s %5zu pairs, %6.2f%% ordered alike\n", lang.sort, pairs, share);
   RecordProperty("agreement", std::to_string(share));
@@ -220,6 +247,30 @@ TEST(CollateLanguageDefault, OrdersWordsAsTheLanguage) {
 }  // namespace
 
 namespace {
+
+// Full-width blanks: bit 0x01 drops them from byte strings as truncation does; the W form
+// drops them on 0x00200000 when width-blind.
+TEST(CollateBlanks, FullWidthBlanksInEachForm) {
+  if (!fs::exists(fs::path(VL_TEST_DEFS_DIR) / "control.nls")) GTEST_SKIP() << "no generated definitions";
+  ts::Library lib(VL_TEST_DEFS_DIR);
+  uint32_t rc;
+  VLLocale *mb = VLGetLocale("German_Germany.MS932@Default", 0, &rc), *sh = VLGetLocale("Japanese_Japan.IBM930@Default", 0, &rc);
+  ASSERT_TRUE(mb && sh && mb->sort && sh->sort);
+  const VLWChar wa[] = {'a', 'b', 0x8140, ' '}, wb[] = {'A', 'B'};
+  struct Case {
+    const char *why;
+    int got, order;
+  } cases[] = {
+      {"0x01 drops a full-width blank", VLStrcoll(mb, "ab\x81\x40 ", -1, "ab", -1, 0x01), 0},
+      {"which counts without it", VLStrcoll(mb, "ab\x81\x40 ", -1, "ab", -1, 0), 1},
+      {"and in the double-byte state", VLStrcollEx(sh, "\x81\x0E\x40\x40\x0F", 0, -1, "\x81", 0, -1, 0x01), 0},
+      {"W drops it on 0x00200000 when width-blind", VLWcscoll(mb, wa, 4, wb, 2, 0x80200041), 0},
+      {"W keeps it when only case-blind", VLWcscoll(mb, wa, 4, wb, 2, 0x80200040), 1},
+  };
+  for (const Case &c : cases) EXPECT_EQ(sign(c.got), c.order) << c.why;
+  VLReleaseLocale(mb);
+  VLReleaseLocale(sh);
+}
 
 // tlx sort: the order of a Swedish list, the options, and the status of bad input.
 TEST(TlxSort, SortsLinesByCollation) {

@@ -4,6 +4,7 @@
 
 #include <cstring>
 #include <functional>
+#include <random>
 #include <string>
 #include <vector>
 
@@ -19,6 +20,8 @@ using U16 = std::u16string;
 mkdefs::SortBody withBackward() {
   mkdefs::SortBody b = sortmem::sampleBody();
   b.weights[0xE4] = {0x120, 6, 1, 0xB << 10};  // a with another backward secondary
+  b.weights[' '] = {0x110, 1, 1, 0xF << 10};    // blanks weigh, so dropping them shows
+  b.blocks[0x30] = {0x02, 0xF, 0x3000};
   return b;
 }
 
@@ -127,6 +130,30 @@ TEST_F(Collate, FormsAgree) {
   }
 }
 
+// Random pairs sharing a beginning, over combinations, expansions, ignorables, fourth-level
+// and backward-secondary characters: every form orders them as their keys do.
+TEST_F(Collate, ComparisonAgreesWithKeysOnRandomPairs) {
+  const char16_t alphabet[] = u"abchzA-\u00e6\u00e4\u00e5\u00e7\u0301 9\u2000\u4e00";
+  std::mt19937 rng(7);
+  auto word = [&](size_t max) {
+    U16 s;
+    for (size_t n = rng() % (max + 1); n--;) s += alphabet[rng() % (std::size(alphabet) - 1)];
+    return s;
+  };
+  for (int i = 0; i < 4000; ++i) {
+    const U16 head = word(3), a = head + word(4), b = head + word(4);
+    const int want = sign(keyU(a).compare(keyU(b)));
+    ASSERT_EQ(sign(collU(a, b)), want) << i;
+    ASSERT_EQ(sign(collU(b, a)), -want) << i;
+    if (a.find_first_of(u"\u0301\u2000\u4e00") != U16::npos || b.find_first_of(u"\u0301\u2000\u4e00") != U16::npos)
+      continue;  // not Latin-1
+    const std::string pa(a.begin(), a.end()), pb(b.begin(), b.end());
+    const std::vector<VLWChar> wa(a.c_str(), a.c_str() + a.size() + 1), wb(b.c_str(), b.c_str() + b.size() + 1);
+    ASSERT_EQ(sign(VLStrcoll(l_, pa.data(), static_cast<int32_t>(pa.size()), pb.data(), static_cast<int32_t>(pb.size()), 0)), want) << i;
+    ASSERT_EQ(sign(VLWcscoll(l_, wa.data(), static_cast<int32_t>(a.size()), wb.data(), static_cast<int32_t>(b.size()), 0)), want) << i;
+  }
+}
+
 TEST_F(Collate, KeysInPlaceAllocatedShortAndEmpty) {
   const U16 s = u"Ch\u00e6-ab\u00e5\u4e00";
   const auto *u = reinterpret_cast<const VLUChar *>(s.data());
@@ -185,16 +212,54 @@ TEST_F(Collate, StepsElementByElement) {
   EXPECT_EQ(counter, 4u);
 }
 
-TEST_F(Collate, CaseBlindOptionsAndTrailingBlanks) {
-  EXPECT_NE(VLStrcoll(l_, "Ab", -1, "ab", -1, 0), 0);
-  EXPECT_EQ(VLStrcoll(l_, "Ab", -1, "ab", -1, VL_COLL_IGNORECASE), 0);
-  EXPECT_LT(VLStrcoll(l_, "Ab", -1, "ac", -1, VL_COLL_IGNORECASE), 0);
-  EXPECT_EQ(VLStrcoll(l_, "ab  ", -1, "ab", -1, 0x01), 0);
-  char k1[64], k2[64];
-  const int32_t n1 = VLStrxfrm(l_, k1, sizeof k1, "ABC", -1, VL_COLL_IGNORECASE);
-  const int32_t n2 = VLStrxfrm(l_, k2, sizeof k2, "abc", -1, VL_COLL_IGNORECASE);
-  ASSERT_EQ(n1, n2);
-  EXPECT_EQ(std::memcmp(k1, k2, static_cast<size_t>(n1)), 0);
+// Trailing blanks, the option words each form takes, and code order through the comparison
+// family, which also gives case-blind searches there their folding.
+TEST_F(Collate, OptionWordsBlanksAndCodeOrder) {
+  uint32_t rc;
+  VLLocale *code = VLGetLocale("English_UnitedStates.Latin1@Binary", 0, &rc);
+  ASSERT_TRUE(code && (code->flags & VL_LF_BINARY));
+  enum Form { Plain, W };
+  struct Case {
+    const char *why;
+    Form form;
+    VLLocale *l;
+    std::string a, b;
+    uint32_t options;
+    int order, code;
+  } cases[] = {
+      {"0x01 drops trailing blanks", Plain, l_, "ab  ", "ab", 0x01, 0, 0},
+      {"blanks count without it", Plain, l_, "ab  ", "ab", 0, 1, 0},
+      {"0x01 clears 0x00200000", Plain, l_, "ab ", "ab", 0x00200001, 0, 0},
+      {"0x00200000 without 0x01 is refused", Plain, l_, "a", "b", 0x00200000, 0, 2},
+      {"the comparison family's blank-blind word passes", Plain, l_, "AB ", "ab", 0x80200041, 0, 0},
+      {"its case-blind word lacks 0x01 and is refused", Plain, l_, "AB", "ab", 0x80200040, 0, 2},
+      {"an unknown bit is refused", Plain, l_, "a", "b", 0x12, 0, 2},
+      {"W drops blanks on 0x00200000", W, l_, "ab  ", "ab", 0x00200000, 0, 0},
+      {"W keeps them on 0x01", W, l_, "ab  ", "ab", 0x01, 1, 0},
+      {"code order is exact without options", Plain, code, "ABC", "abc", 0, -1, 0},
+      {"code order folds case as the comparison does", Plain, code, "ABC", "abc", VL_COLL_IGNORECASE, 0, 0},
+      {"code order drops blanks on 0x00200000", Plain, code, "ab  ", "ab", 0x00200000, 0, 0},
+      {"W code order folds case", W, code, "ABC", "abc", VL_COLL_IGNOREWIDTH, 0, 0},
+  };
+  for (const Case &c : cases) {
+    int r;
+    if (c.form == Plain) {
+      r = VLStrcoll(c.l, c.a.data(), static_cast<int32_t>(c.a.size()), c.b.data(), static_cast<int32_t>(c.b.size()),
+                    c.options);
+    } else {
+      const std::vector<VLWChar> wa(c.a.begin(), c.a.end()), wb(c.b.begin(), c.b.end());
+      r = VLWcscoll(c.l, wa.data(), static_cast<int32_t>(wa.size()), wb.data(), static_cast<int32_t>(wb.size()),
+                    c.options);
+    }
+    EXPECT_EQ(sign(r), c.order) << c.why;
+    EXPECT_EQ(VLGetError(c.l), c.code) << c.why;
+  }
+  const VLUChar str[] = {'x', 'A', 'b', 'D', 0}, sub[] = {'a', 'B', 'd', 0};
+  const char *hay = "xAbD";
+  EXPECT_EQ(VLStrstr(code, hay, -1, "aBd", -1, VL_COLL_IGNORECASE), hay + 1) << "folded as VLStrcmp folds";
+  EXPECT_EQ(VLStrstrU(code, str, -1, sub, -1, VL_COLL_IGNORECASE), str + 1) << "UTF-16 folds case in code order";
+  EXPECT_EQ(VLStrstrU(code, str, -1, sub, -1, 0), nullptr);
+  VLReleaseLocale(code);
 }
 
 }  // namespace
@@ -239,7 +304,8 @@ namespace {
 
 // Each allocation a call makes fails in turn: code 20, the documented result, no leak.
 TEST_F(Collate, AllocationFailures) {
-  const std::string longer(200, 'a'), other = std::string(199, 'a') + "b";
+  // Pairs that differ in a primary are decided without a work area: these differ in case.
+  const std::string longer(200, 'a'), other = "A" + std::string(199, 'a');
   const U16 units(100, u'a');
   struct Case {
     const char *why;

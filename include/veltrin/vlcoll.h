@@ -62,8 +62,10 @@ VL_API int32_t VLWcsxfrm(VLLocale *locale, char *dst, int32_t dstLen, const VLWC
 VL_API int32_t VLStrxfrmU(VLLocale *locale, char *dst, int32_t dstLen, const VLUChar *src, int32_t srcLen,
                           uint32_t options);
 
-/* Linguistic comparison: negative, 0 or positive. Option bit 0x01 makes trailing blanks
-   insignificant. */
+/* Linguistic comparison: negative, 0 or positive. Options 0, VL_COLL_IGNORECASE or
+   VL_COLL_IGNOREWIDTH; bit 0x01 makes trailing blanks (full-width ones too) insignificant
+   and clears 0x00200000 (VLWcscoll: 0x00200000 does it). Other words: code 2, result 0.
+   A locale that sorts by code compares as VLStrcmp. */
 VL_API int VLStrcoll(VLLocale *locale, const char *str1, int32_t len1, const char *str2, int32_t len2,
                      uint32_t options);
 VL_API int VLStrcollEx(VLLocale *locale, const char *str1, VLShiftState state1, int32_t len1, const char *str2,
