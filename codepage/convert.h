@@ -280,7 +280,7 @@ struct IndexEnc {
   const VLCodePage *cp;
   const uint8_t *index, *low;
   const uint8_t *entry = nullptr;
-  const uint8_t *tab = nullptr;
+  const uint8_t *tab = nullptr, *htab = nullptr;
   unsigned high = 0x100, lo = 1, hi = 0, mask = 0;
   uint8_t kind = 0xFF;
   uint8_t sub;
@@ -295,6 +295,10 @@ struct IndexEnc {
     kind = entry[0];
     tab = low ? low + rd16(entry + 4) : nullptr;
     if (!tab) lo = 1, hi = 0;
+    if (kind == 2) {
+      htab = cp::highTable(cp) ? cp::highTable(cp) + rd16(entry + 6) : nullptr;
+      if (!htab) kind = 3;  // left to the primitives
+    }
   }
   [[gnu::always_inline]] unsigned operator()(Value u, uint8_t *out) {
     unsigned h = (u >> 8) & 0xFF, l = u & 0xFF;
@@ -307,8 +311,15 @@ struct IndexEnc {
       out[0] = tab[l & mask];
       return 1;
     }
-    if (kind == 1) {
-      unsigned v = rd16(tab + 2u * (l & mask));
+    if (kind == 1 || kind == 2) {
+      unsigned i = l & mask, v = rd16(tab + 2u * i);
+      // Blocks of a page with three-byte characters hold a third byte for every unit.
+      if (kind == 2 && htab[i]) {
+        out[0] = htab[i];
+        out[1] = static_cast<uint8_t>(v >> 8);
+        out[2] = static_cast<uint8_t>(v);
+        return v > 0xFF ? 3 : wide(u, out);
+      }
       if (v > 0xFF) {
         out[0] = static_cast<uint8_t>(v >> 8);
         out[1] = static_cast<uint8_t>(v);
