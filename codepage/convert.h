@@ -283,6 +283,7 @@ struct WReader {
 
 // A code page target: the index entry of the last high byte is kept with its bounds, so a
 // run in one block of 256 units is a compare and a table load per unit.
+// Writes 4 bytes at out whatever the character's length: every caller has that room.
 struct IndexEnc {
   static constexpr unsigned kMax = 4;
   const VLCodePage *cp;
@@ -303,10 +304,7 @@ struct IndexEnc {
     kind = entry[0];
     tab = low ? low + rd16(entry + 4) : nullptr;
     if (!tab) lo = 1, hi = 0;
-    if (kind == 2) {
-      htab = cp::highTable(cp) ? cp::highTable(cp) + rd16(entry + 6) : nullptr;
-      if (!htab) kind = 3;  // left to the primitives
-    }
+    htab = cp::highTable(cp) ? cp::highTable(cp) + rd16(entry + 6) : nullptr;
   }
   [[gnu::always_inline]] unsigned operator()(Value u, uint8_t *out) {
     unsigned h = (u >> 8) & 0xFF, l = u & 0xFF;
@@ -319,15 +317,8 @@ struct IndexEnc {
       out[0] = tab[l & mask];
       return 1;
     }
-    if (kind == 1 || kind == 2) {
-      unsigned i = l & mask, v = rd16(tab + 2u * i);
-      // Blocks of a page with three-byte characters hold a third byte for every unit.
-      if (kind == 2 && htab[i]) {
-        out[0] = htab[i];
-        out[1] = static_cast<uint8_t>(v >> 8);
-        out[2] = static_cast<uint8_t>(v);
-        return v > 0xFF ? 3 : wide(u, out);
-      }
+    if (kind == 1) {
+      unsigned v = rd16(tab + 2u * (l & mask));
       if (v > 0xFF) {
         out[0] = static_cast<uint8_t>(v >> 8);
         out[1] = static_cast<uint8_t>(v);
@@ -336,7 +327,18 @@ struct IndexEnc {
       out[0] = static_cast<uint8_t>(v);
       return 1;
     }
+    if (kind == 2) return third(u, l & mask, out);
     return wide(u, out);
+  }
+  // Blocks with a third byte: two and three bytes without a branch between them (in
+  // Japanese text they alternate at random); all four bytes are stored, n of them count.
+  [[gnu::always_inline]] unsigned third(Value u, unsigned i, uint8_t *out) const {
+    unsigned v = rd16(tab + 2u * i), t = htab[i];  // the load-time check proved the table there
+    if (v <= 0xFF) return wide(u, out);
+    unsigned n = 2 + (t != 0);
+    uint32_t be = __builtin_bswap32(((t << 16) | v) << (8 * (4 - n)));
+    std::memcpy(out, &be, 4);
+    return n;
   }
   // Characters of three or four bytes: the primitives' own reading of the entry.
   [[gnu::noinline]] unsigned wide(Value u, uint8_t *out) const {
