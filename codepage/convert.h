@@ -281,10 +281,17 @@ struct WReader {
 // ---- Encoders: a value to the bytes of one character ---------------------------------
 // kMax: the most bytes one value gives.
 
+// The third bytes of blocks that have none.
+inline constexpr uint8_t kNoThird[256] = {};
+
 // A code page target: the index entry of the last high byte is kept with its bounds, so a
 // run in one block of 256 units is a compare and a table load per unit.
 // Writes 4 bytes at out whatever the character's length: every caller has that room.
-struct IndexEnc {
+// kThirds: for pages with characters of three bytes, where blocks of one- and two-byte
+// values mix with blocks that have a third byte, all of them go the branch-free way; other
+// pages keep a branch on the length, which their runs predict.
+template <bool kThirds>
+struct IndexEncT {
   static constexpr unsigned kMax = 4;
   const VLCodePage *cp;
   const uint8_t *index, *low;
@@ -293,7 +300,7 @@ struct IndexEnc {
   unsigned high = 0x100, lo = 1, hi = 0, mask = 0;
   uint8_t kind = 0xFF;
   uint8_t sub;
-  explicit IndexEnc(const VLCodePage *c)
+  explicit IndexEncT(const VLCodePage *c)
       : cp(c), index(cp::body(c) + cp::kIndex), low(cp::lowTable(c)), sub(cp::subst(c)) {}
   void load(unsigned h) {
     high = h;
@@ -304,7 +311,11 @@ struct IndexEnc {
     kind = entry[0];
     tab = low ? low + rd16(entry + 4) : nullptr;
     if (!tab) lo = 1, hi = 0;
-    htab = cp::highTable(cp) ? cp::highTable(cp) + rd16(entry + 6) : nullptr;
+    // Blocks of kind 2 have their high table: the load-time check proved it.
+    if constexpr (kThirds)
+      htab = kind == 2 ? cp::highTable(cp) + rd16(entry + 6) : kNoThird;
+    else
+      htab = cp::highTable(cp) ? cp::highTable(cp) + rd16(entry + 6) : nullptr;
   }
   [[gnu::always_inline]] unsigned operator()(Value u, uint8_t *out) {
     unsigned h = (u >> 8) & 0xFF, l = u & 0xFF;
@@ -317,24 +328,32 @@ struct IndexEnc {
       out[0] = tab[l & mask];
       return 1;
     }
-    if (kind == 1) {
-      unsigned v = rd16(tab + 2u * (l & mask));
-      if (v > 0xFF) {
-        out[0] = static_cast<uint8_t>(v >> 8);
-        out[1] = static_cast<uint8_t>(v);
-        return 2;
+    if constexpr (kThirds) {
+      if (kind == 1 || kind == 2) return third(u, l & mask, out);
+    } else {
+      if (kind == 1) {
+        unsigned v = rd16(tab + 2u * (l & mask));
+        if (v > 0xFF) {
+          out[0] = static_cast<uint8_t>(v >> 8);
+          out[1] = static_cast<uint8_t>(v);
+          return 2;
+        }
+        out[0] = static_cast<uint8_t>(v);
+        return 1;
       }
-      out[0] = static_cast<uint8_t>(v);
-      return 1;
+      if (kind == 2) return third(u, l & mask, out);
     }
-    if (kind == 2) return third(u, l & mask, out);
     return wide(u, out);
   }
   // Blocks with a third byte: two and three bytes without a branch between them (in
   // Japanese text they alternate at random); all four bytes are stored, n of them count.
   [[gnu::always_inline]] unsigned third(Value u, unsigned i, uint8_t *out) const {
-    unsigned v = rd16(tab + 2u * i), t = htab[i];  // the load-time check proved the table there
-    if (v <= 0xFF) return wide(u, out);
+    unsigned v = rd16(tab + 2u * i), t = htab[i];
+    if (v <= 0xFF) {
+      if (t) return wide(u, out);  // a zero byte inside: dropped, as ever
+      out[0] = static_cast<uint8_t>(v);
+      return 1;
+    }
     unsigned n = 2 + (t != 0);
     uint32_t be = __builtin_bswap32(((t << 16) | v) << (8 * (4 - n)));
     std::memcpy(out, &be, 4);
@@ -346,6 +365,8 @@ struct IndexEnc {
   }
 };
 
+
+using IndexEnc = IndexEncT<false>;
 
 struct Utf8Enc {
   static constexpr unsigned kMax = 3;
@@ -620,6 +641,10 @@ inline auto withByteWriter(const VLCodePage *c, bool shiftAware, uint8_t *o, siz
   }
   if (cp::isUtf8(c)) {
     ByteWriter<Utf8Enc> w(c, o, n);
+    return f(w);
+  }
+  if (cp::maxLen(c) >= 3) {
+    ByteWriter<IndexEncT<true>> w(c, o, n);
     return f(w);
   }
   ByteWriter<IndexEnc> w(c, o, n);
