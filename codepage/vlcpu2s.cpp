@@ -34,6 +34,17 @@ size_t untilZero(const VLUChar *u, size_t count) {
   return n;
 }
 
+// One function per writer, as the family has it: inlined into one body the three loops
+// measured a fifth slower.
+template <class W>
+[[gnu::noinline]] size_t run(W &w, const VLUChar *u, size_t n) {
+  vl::cnv::U16Reader r(u, n);
+  size_t chars = 0;
+  vl::cnv::Value held = 0;
+  vl::cnv::pump(r, w, chars, vl::cnv::kNoLimit, held);
+  return static_cast<size_t>(w.o - w.start);
+}
+
 int32_t shifted(const VLCodePage *c, const VLUChar *u, size_t count, bool wide, uint8_t *out) {
   const uint8_t so = shiftOut(c), si = shiftIn(c);
   size_t pos = 0;
@@ -67,13 +78,7 @@ int32_t VLCpUnicodeToStr(const VLCodePage *cp, const VLUChar *u, int32_t length,
   // The family's writers: output room is the caller's promise, so it is given as the most
   // the units can take.
   size_t n = untilZero(u, count);
-  size_t pos = vl::cnv::withByteWriter(cp, false, out, n * 4, 0, [&](auto &w) {
-    vl::cnv::U16Reader r(u, n);
-    size_t chars = 0;
-    vl::cnv::Value held = 0;
-    vl::cnv::pump(r, w, chars, vl::cnv::kNoLimit, held);
-    return static_cast<size_t>(w.o - w.start);
-  });
+  size_t pos = vl::cnv::withByteWriter(cp, false, out, n * 4, 0, [&](auto &w) { return run(w, u, n); });
   out[pos] = 0;
   VL_RET(static_cast<int32_t>(pos));
 }
