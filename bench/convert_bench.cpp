@@ -116,6 +116,15 @@ void fromUtf16Ours(benchmark::State &st, uint16_t id) {
   st.SetBytesProcessed(static_cast<int64_t>(st.iterations() * p.text.size() * 2));
 }
 
+// The primitive, on the text of the family's row.
+void fromUtf16Prim(benchmark::State &st, uint16_t id) {
+  Loaded &p = g_pages[id];
+  std::vector<unsigned char> out(p.text.size() * 4 + 16);
+  auto *in = reinterpret_cast<const VLUChar *>(p.text.data());
+  for (auto _ : st) benchmark::DoNotOptimize(VLCpUnicodeToStr(p.locale.codePage, in, static_cast<int32_t>(p.text.size()), 0, out.data()));
+  st.SetBytesProcessed(static_cast<int64_t>(st.iterations() * p.text.size() * 2));
+}
+
 void viaIconv(benchmark::State &st, const char *to, const char *from, const std::string &in) {
   iconv_t cd = iconv_open(to, from);
   if (cd == reinterpret_cast<iconv_t>(-1)) {
@@ -301,6 +310,12 @@ int main(int argc, char **argv) {
     benchmark::RegisterBenchmark(("UTF16>" + row + "/memcpy").c_str(), viaMemcpy, u16);
     benchmark::RegisterBenchmark(("UTF16>" + row + "/iconv").c_str(), viaIconv, pg.iconv, "UTF-16LE", u16);
     benchmark::RegisterBenchmark(("UTF16>" + row + "/icu").c_str(), fromUtf16Icu, pg.icu, lp.text);
+    if (vl::cp::maxLen(e) == 1) {
+      std::string prim = "VLCpUnicodeToStr " + row;
+      benchmark::RegisterBenchmark((prim + "/veltrin").c_str(), fromUtf16Prim, key);
+      benchmark::RegisterBenchmark((prim + "/iconv").c_str(), viaIconv, pg.iconv, "UTF-16LE", u16);
+      benchmark::RegisterBenchmark((prim + "/icu").c_str(), fromUtf16Icu, pg.icu, lp.text);
+    }
   }
   // One pair without UTF-16 on either side: Japanese from the PC page to EUC.
   if (g_pages.count(932) && g_pages.count(954)) {

@@ -41,12 +41,20 @@ inline unsigned plainIn(const uint8_t *sb, const uint8_t *len) {
 // Units that encode to the byte of the same value.
 inline unsigned plainOut(const VLCodePage *c) {
   const uint8_t *x = cp::body(c) + cp::kIndex, *low = cp::lowTable(c);
-  if (!low || x[0] != 0 || x[2] != 0) return 0;
+  if (!low || x[0] > 1 || x[2] != 0) return 0;
   const uint8_t *tab = low + rd16(x + 4);
   unsigned l = 0;
   for (; l <= x[3]; ++l)
-    if (tab[l & x[1]] != l) break;
+    if ((x[0] ? rd16(tab + 2u * (l & x[1])) : tab[l & x[1]]) != l) break;
   return l >= 0x100 ? 0x100 : l >= 0x80 ? 0x80 : 0;
+}
+
+// Readers of double-byte pages take ASCII runs too: in their text (Japanese, say) ASCII
+// comes in runs between runs of long characters, and a run costs less than its chain of
+// lead-byte lookups, each waiting for the one before. (Writers gain nothing measurable.)
+template <class R>
+constexpr bool asciiRuns(const R &r) {
+  return requires { r.len.t; };
 }
 
 // A run of plain values, many at a time.
@@ -285,18 +293,26 @@ struct WReader {
 // ---- Encoders: a value to the bytes of one character ---------------------------------
 // kMax: the most bytes one value gives.
 
+// The third bytes of blocks that have none.
+inline constexpr uint8_t kNoThird[256] = {};
+
 // A code page target: the index entry of the last high byte is kept with its bounds, so a
 // run in one block of 256 units is a compare and a table load per unit.
-struct IndexEnc {
+// Writes 4 bytes at out whatever the character's length: every caller has that room.
+// kThirds: for pages with characters of three bytes, where blocks of one- and two-byte
+// values mix with blocks that have a third byte, all of them go the branch-free way; other
+// pages keep a branch on the length, which their runs predict.
+template <bool kThirds>
+struct IndexEncT {
   static constexpr unsigned kMax = 4;
   const VLCodePage *cp;
   const uint8_t *index, *low;
   const uint8_t *entry = nullptr;
-  const uint8_t *tab = nullptr;
+  const uint8_t *tab = nullptr, *htab = nullptr;
   unsigned high = 0x100, lo = 1, hi = 0, mask = 0;
   uint8_t kind = 0xFF;
   uint8_t sub;
-  explicit IndexEnc(const VLCodePage *c)
+  explicit IndexEncT(const VLCodePage *c)
       : cp(c), index(cp::body(c) + cp::kIndex), low(cp::lowTable(c)), sub(cp::subst(c)) {}
   void load(unsigned h) {
     high = h;
@@ -307,6 +323,11 @@ struct IndexEnc {
     kind = entry[0];
     tab = low ? low + rd16(entry + 4) : nullptr;
     if (!tab) lo = 1, hi = 0;
+    // Blocks of kind 2 have their high table: the load-time check proved it.
+    if constexpr (kThirds)
+      htab = kind == 2 ? cp::highTable(cp) + rd16(entry + 6) : kNoThird;
+    else
+      htab = cp::highTable(cp) ? cp::highTable(cp) + rd16(entry + 6) : nullptr;
   }
   [[gnu::always_inline]] unsigned operator()(Value u, uint8_t *out) {
     unsigned h = (u >> 8) & 0xFF, l = u & 0xFF;
@@ -319,17 +340,36 @@ struct IndexEnc {
       out[0] = tab[l & mask];
       return 1;
     }
-    if (kind == 1) {
-      unsigned v = rd16(tab + 2u * (l & mask));
-      if (v > 0xFF) {
-        out[0] = static_cast<uint8_t>(v >> 8);
-        out[1] = static_cast<uint8_t>(v);
-        return 2;
+    if constexpr (kThirds) {
+      if (kind == 1 || kind == 2) return third(u, l & mask, out);
+    } else {
+      if (kind == 1) {
+        unsigned v = rd16(tab + 2u * (l & mask));
+        if (v > 0xFF) {
+          out[0] = static_cast<uint8_t>(v >> 8);
+          out[1] = static_cast<uint8_t>(v);
+          return 2;
+        }
+        out[0] = static_cast<uint8_t>(v);
+        return 1;
       }
+      if (kind == 2) return third(u, l & mask, out);
+    }
+    return wide(u, out);
+  }
+  // Blocks with a third byte: two and three bytes without a branch between them (in
+  // Japanese text they alternate at random); all four bytes are stored, n of them count.
+  [[gnu::always_inline]] unsigned third(Value u, unsigned i, uint8_t *out) const {
+    unsigned v = rd16(tab + 2u * i), t = htab[i];
+    if (v <= 0xFF) {
+      if (t) return wide(u, out);  // a zero byte inside: dropped, as ever
       out[0] = static_cast<uint8_t>(v);
       return 1;
     }
-    return wide(u, out);
+    unsigned n = 2 + (t != 0);
+    uint32_t be = __builtin_bswap32(((t << 16) | v) << (8 * (4 - n)));
+    std::memcpy(out, &be, 4);
+    return n;
   }
   // Characters of three or four bytes: the primitives' own reading of the entry.
   [[gnu::noinline]] unsigned wide(Value u, uint8_t *out) const {
@@ -337,6 +377,8 @@ struct IndexEnc {
   }
 };
 
+
+using IndexEnc = IndexEncT<false>;
 
 struct Utf8Enc {
   static constexpr unsigned kMax = 3;
@@ -389,7 +431,7 @@ struct ByteWriter {
     return plain;
   }
   size_t safe() const { return static_cast<size_t>(end - o) / E::kMax; }
-  void fast(Value v) { o += enc(v, o); }
+  [[gnu::always_inline]] void fast(Value v) { o += enc(v, o); }
   bool put(Value v) {
     uint8_t b[8];
     unsigned n = enc(v, b);
@@ -629,9 +671,9 @@ inline Stop pump(R &r, W &w, size_t &chars, size_t maxChars, Value &held) {
       }
       if constexpr (requires { plainCopy(lr.p, lw.o, n, 0u); }) {
         if (n >= 32 && !blocked) lim = std::min(lr.plainBelow(), lw.plainBelow());
-        // Runs pay only where every byte is plain: in other pages the runs of real text
-        // are shorter than a block, and the table loop below is faster there.
-        if (lim < 0x100) lim = 0;
+        // Runs pay where every byte is plain and in double-byte sources: in other pages the
+        // runs of real text are shorter than a block, and the table loop below is faster.
+        if (lim < 0x100 && !asciiRuns(lr)) lim = 0;
         if (lim >= 0x80) {
           lim = lim >= 0x100 ? 0x100 : 0x80;
           while (i < n) {
@@ -731,6 +773,10 @@ inline auto withByteWriter(const VLCodePage *c, bool shiftAware, uint8_t *o, siz
   }
   if (cp::isUtf8(c)) {
     ByteWriter<Utf8Enc> w(c, o, n);
+    return f(w);
+  }
+  if (cp::maxLen(c) >= 3) {
+    ByteWriter<IndexEncT<true>> w(c, o, n);
     return f(w);
   }
   ByteWriter<IndexEnc> w(c, o, n);

@@ -3,8 +3,8 @@
 // lenient truncation of trailing spaces.
 #include <cstdint>
 
+#include "codepage/convert.h"
 #include "store/store.h"
-#include "codepage/cpbody.h"
 #include "service/service.h"
 
 VL_TRACE_MODULE("tlxnsts");
@@ -124,6 +124,87 @@ struct Writer {
     db = false;
   }
 };
+
+// The bulk of the text through the conversion family's loop: a source prefix so short that
+// its output surely fits (every source byte gives at most one character of the target's
+// longest length, behind a shift byte) needs no room test per character. The loop of r
+// and w takes the rest: the cut character, the last characters before a full output,
+// lenient endings.
+template <class F>
+void withSourceReader(const Side &s, const uint8_t *p, size_t n, bool db, F &&f) {
+  namespace cn = vl::cnv;
+  switch (s.kind) {
+    case Kind::Utf16: {
+      cn::U16Reader r(reinterpret_cast<const VLUChar *>(p), n / 2);
+      return f(r);
+    }
+    case Kind::Single: {
+      cn::SbReader<cn::TrieUni> r(s.cp, p, n);
+      return f(r);
+    }
+    case Kind::Shift: {
+      cn::ShiftReader<cn::TrieUni> r(s.cp, p, n, db);
+      return f(r);
+    }
+    case Kind::Multi:
+      if (vl::cp::isUtf8(s.cp)) {
+        cn::MbReader<cn::Utf8Len, cn::Utf8Uni> r(s.cp, p, n);
+        return f(r);
+      }
+      cn::MbReader<cn::TableLen, cn::TrieUni> r(s.cp, p, n);
+      return f(r);
+  }
+}
+
+template <class F>
+void withTargetWriter(const Side &t, uint8_t *o, size_t n, bool db, F &&f) {
+  namespace cn = vl::cnv;
+  if (t.kind == Kind::Utf16) {
+    cn::U16Writer w(reinterpret_cast<VLUChar *>(o), n / 2);
+    return f(w);
+  }
+  if (t.kind == Kind::Shift) {
+    cn::ShiftWriter<cn::IndexEnc> w(t.cp, o, n, db);
+    return f(w);
+  }
+  if (vl::cp::isUtf8(t.cp)) {
+    cn::ByteWriter<cn::Utf8Enc> w(t.cp, o, n);
+    return f(w);
+  }
+  cn::ByteWriter<cn::IndexEnc> w(t.cp, o, n);
+  f(w);
+}
+
+// True when it converted something and more may follow.
+bool bulkStep(const Side &source, const Side &target, Reader &r, Writer &w) {
+  const size_t closing = target.kind == Kind::Shift ? 1 : 0;
+  const size_t per = target.kind == Kind::Utf16 ? 2 : vl::cp::maxLen(target.cp) + closing;
+  size_t n = static_cast<size_t>(r.end - r.p);
+  if (w.charCap != INT64_MAX) n = std::min(n, static_cast<size_t>(w.charCap - w.chars));
+  size_t room = n * per;
+  if (w.cap != SIZE_MAX) {
+    room = w.cap - w.used - std::min(w.cap - w.used, closing);
+    n = std::min(n, room / per);
+  }
+  // UTF-16 sides are read and written in place, so only where they are aligned.
+  auto odd = [](const void *q) { return (reinterpret_cast<uintptr_t>(q) & 1) != 0; };
+  if (n < 64 || (source.kind == Kind::Utf16 && odd(r.p)) || (target.kind == Kind::Utf16 && odd(w.out + w.used)))
+    return false;
+  const uint8_t *from = r.p;
+  withSourceReader(source, r.p, n, r.db, [&](auto &fr) {
+    withTargetWriter(target, w.out + w.used, room, w.db, [&](auto &fw) {
+      size_t chars = 0;
+      vl::cnv::Value held = 0;
+      vl::cnv::pump(fr, fw, chars, vl::cnv::kNoLimit, held);
+      r.p = reinterpret_cast<const uint8_t *>(fr.p);
+      r.db = fr.state != 0;
+      w.used += static_cast<size_t>(reinterpret_cast<uint8_t *>(fw.o) - reinterpret_cast<uint8_t *>(fw.start));
+      w.db = fw.state != 0;
+      w.chars += static_cast<int64_t>(chars);
+    });
+  });
+  return r.p != from && r.p != r.end;
+}
 
 // Everything from the reader's position on is the space character.
 bool onlySpaces(Reader r) {
@@ -284,6 +365,8 @@ int32_t NLS1_TranslateString(uint32_t targetCodePage, void *outVoid, int32_t out
     VL_DETAIL(extOut ? "Process multi-byte Input, Extended Multi-byte output " : "Process Multi-Byte Input, Multi-byte output ");
 
   Reader r{&source, src, src + srcBytes};
+  while (bulkStep(source, target, r, w)) {
+  }
   uint32_t result = 0;
   for (;;) {
     Reader before = r;

@@ -226,6 +226,14 @@ TEST_F(Pages, Strings) {
     out.resize(static_cast<size_t>(n) + (&c.page == &sh ? 0 : 1));
     EXPECT_EQ(out, c.out) << c.page.entry.id << " " << c.in[0];
   }
+  // The 0 that ends the input is found at any place within or after a block of units.
+  for (size_t at = 0; at <= 40; ++at) {
+    Units in(40, 0x41);
+    if (at < in.size()) in[at] = 0;
+    Bytes out(48, 0xEE);
+    EXPECT_EQ(VLCpUnicodeToStr(db.cp(), in.data(), 40, 0, out.data()), static_cast<int32_t>(at)) << "0 at " << at;
+    EXPECT_EQ(out[at], 0) << "0 at " << at;
+  }
 }
 
 TEST_F(Pages, Lengths) {

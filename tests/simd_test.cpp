@@ -145,14 +145,15 @@ class SimdConvert : public ::testing::Test {
 TEST_F(SimdConvert, EveryLevelGivesTheSameBytes) {
   std::mt19937 rng(5);
   // Text: ASCII runs of 1..70 with one other character between them.
-  const char32_t others[] = {0xE9, 0xFC, 0x20AC, 0x3042, 0x65E5, 0xDF};
+  const char32_t others[] = {0xE9, 0xFC, 0x20AC, 0x3042, 0x65E5, 0xDF, 0x4E02};
   std::u16string text;
   for (int k = 0; k < 400; ++k) {
     size_t run = 1 + rng() % 70;
     for (size_t i = 0; i < run; ++i) text.push_back(static_cast<char16_t>(0x20 + rng() % 0x5F));
     text.push_back(static_cast<char16_t>(others[rng() % std::size(others)]));
   }
-  for (const char *name : {"English_UnitedStates.UTF-8", "English_UnitedStates.MS1252", "English_UnitedStates.MS932"}) {
+  for (const char *name : {"English_UnitedStates.UTF-8", "English_UnitedStates.MS1252", "English_UnitedStates.MS932",
+                           "English_UnitedStates.JapanEUC"}) {
     uint32_t rc;
     VLLocale *l = VLGetLocale(name, 0, &rc);
     ASSERT_NE(l, nullptr) << name;
