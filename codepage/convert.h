@@ -83,7 +83,16 @@ struct TrieUni {
     }
     return cp::kReplacement;
   }
+  // multi(p, 2), unrolled.
+  Value two(const uint8_t *p) const {
+    const unsigned b0 = p[0], b1 = p[1];
+    if (!t || t[0] || b0 < t[2] || b0 > t[3]) return multi(p, 2);
+    const uint8_t *node = t + cp::kNodeSize * (rd16(t + 4) + (b0 & t[1]));
+    if (!node[0] || b1 < node[2] || b1 > node[3]) return cp::kReplacement;
+    return rd16(values + 2u * (rd16(node + 4) + (b1 & node[1])));
+  }
 };
+
 
 // UTF-8 by arithmetic; one-byte characters still through the table.
 struct Utf8Uni {
@@ -184,6 +193,14 @@ struct MbReader {
   }
   unsigned need(uint8_t lead) const { return len(lead); }
   Value decode(const uint8_t *q, unsigned n) const { return n == 1 ? d.one(q[0]) : d.multi(q, n); }
+  // Lead bytes of long characters as ranges, for framing a block at a time; 0 when none
+  // or too many (once known: 1 ranges usable, 0 not).
+  int framed = -1;
+  simd::LeadRanges leads;
+  bool frames() requires requires { len.t; } {
+    if (framed < 0) framed = leads.build(len.t) && leads.count;
+    return framed != 0;
+  }
   unsigned plain = ~0u;
   unsigned plainBelow() {
     if (plain == ~0u) {
@@ -620,6 +637,96 @@ inline size_t blocks(U16Reader &r, ByteWriter<IndexEnc> &w, size_t n) {
   r.p += i;
   w.o += i;
   return i;
+}
+
+// Pages whose characters take up to three bytes by a length table. A block of 64 bytes is
+// framed from the masks of its leads, with no chain of lead-byte lookups: a two-byte lead
+// takes the byte after it, unless it is itself taken (runs of leads alternate), as the
+// character loop frames them from the block's first byte. A three-byte lead is framed
+// as one byte followed by a two-byte character, which holds for every lead whose next
+// byte leads two bytes; any other, a longer lead, or a character crossing the block's
+// end ends the step before it.
+inline uint64_t secondBytes(uint64_t leads) {
+  constexpr uint64_t even = 0x5555555555555555u;
+  const uint64_t follows = leads << 1;
+  const uint64_t oddStarts = leads & ~even & ~follows;
+  const uint64_t evenRuns = oddStarts + leads;  // runs of leads starting at odd bits now start at even ones
+  return (even ^ (evenRuns << 1)) & follows;
+}
+template <class D>
+inline bool blocksOn(MbReader<TableLen, D> &r, U16Writer &) requires requires { r.d.t; } {
+  return r.frames();
+}
+// kPop: the processor counts bits in one instruction, so a character's rank among the
+// block's is counted where it is written; otherwise a pass over the block notes each.
+template <bool kPop, class D>
+[[gnu::always_inline]] inline size_t framedBlocks(MbReader<TableLen, D> &r, U16Writer &w, size_t n) {
+  size_t done = 0;
+  const D d = r.d;
+  const uint8_t *lens = r.len.t;
+  while (n - done >= 64) {
+    const uint8_t *p = r.p;
+    const simd::LeadMasks m = simd::leadMasks(p, r.leads, lens);
+    const uint64_t starts = ~secondBytes(m.two);
+    const uint64_t three = m.three & starts;
+    constexpr uint64_t top = uint64_t{1} << 63, two = uint64_t{3} << 62;
+    // A character that ends past the block starts the next one; one the framing cannot
+    // take ends the step.
+    const uint64_t stop = (m.longer & starts) | (three & ~(m.two >> 1)) | (three & two) | (m.two & starts & top);
+    const unsigned end = stop ? static_cast<unsigned>(__builtin_ctzll(stop)) : 64;
+    if (!end) break;
+    const uint64_t take = (end == 64 ? ~uint64_t{0} : (uint64_t{1} << end) - 1) & starts & ~(three << 1);
+    // One loop per length, each character written at its rank among the block's: the
+    // loops branch only on their ends, wherever the lengths change.
+    VLUChar *o = w.o;
+    uint8_t ranks[64];
+    if constexpr (!kPop) {
+      unsigned k = 0;
+      for (uint64_t x = take; x; x &= x - 1) ranks[__builtin_ctzll(x)] = static_cast<uint8_t>(k++);
+    }
+    const auto rank = [&](unsigned at) -> unsigned {
+      if constexpr (kPop)
+        return static_cast<unsigned>(__builtin_popcountll(take & ((uint64_t{1} << at) - 1)));
+      else
+        return ranks[at];
+    };
+    for (uint64_t x = take & ~m.two & ~three; x; x &= x - 1) {
+      const auto at = static_cast<unsigned>(__builtin_ctzll(x));
+      o[rank(at)] = static_cast<VLUChar>(d.one(p[at]));
+    }
+    for (uint64_t x = take & m.two; x; x &= x - 1) {
+      const auto at = static_cast<unsigned>(__builtin_ctzll(x));
+      o[rank(at)] = static_cast<VLUChar>(d.two(p + at));
+    }
+    for (uint64_t x = take & three; x; x &= x - 1) {
+      const auto at = static_cast<unsigned>(__builtin_ctzll(x));
+      o[rank(at)] = static_cast<VLUChar>(d.multi(p + at, 3));
+    }
+    size_t count;
+    if constexpr (kPop)
+      count = static_cast<size_t>(__builtin_popcountll(take));
+    else
+      count = ranks[63 - __builtin_clzll(take)] + size_t{1};
+    done += count;
+    w.o = o + count;
+    r.p += end;
+  }
+  return done;
+}
+#ifdef __x86_64__
+template <class D>
+[[gnu::target("popcnt")]] size_t framedBlocksPop(MbReader<TableLen, D> &r, U16Writer &w, size_t n) {
+  return framedBlocks<true>(r, w, n);
+}
+#endif
+// The scalar level leaves every character to the character loop, which the tests hold the
+// framing against.
+template <class D>
+inline size_t blocks(MbReader<TableLen, D> &r, U16Writer &w, size_t n) requires requires { r.d.t; } {
+#ifdef __x86_64__
+  if (simd::level() == simd::kAvx2) return framedBlocksPop(r, w, n);  // every AVX2 processor counts bits
+#endif
+  return simd::level() == simd::kScalar ? 0 : framedBlocks<false>(r, w, n);
 }
 
 // UTF-8 and UTF-16 both ways, where the page's ASCII is plain.

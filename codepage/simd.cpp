@@ -393,6 +393,25 @@ template <bool Wide>
 
 std::atomic<int> levelNow{g_detected};
 
+#ifdef VL_SIMD_X86
+[[gnu::target("avx2")]] static void leadMasksAvx2(const uint8_t *s, const LeadRanges &r, LeadMasks &m) {
+  for (unsigned k = 0; k < 64; k += 32) {
+    const __m256i x = _mm256_loadu_si256(reinterpret_cast<const __m256i *>(s + k)), z = _mm256_setzero_si256();
+    __m256i two = z, three = z, longer = z;
+    for (unsigned i = 0; i < r.count; ++i) {
+      const __m256i t = _mm256_sub_epi8(x, _mm256_load_si256(reinterpret_cast<const __m256i *>(r.loV[i])));
+      const __m256i in =
+          _mm256_cmpeq_epi8(_mm256_min_epu8(t, _mm256_load_si256(reinterpret_cast<const __m256i *>(r.spanV[i]))), t);
+      __m256i &to = i < r.twos ? two : i < r.twos + r.threes ? three : longer;
+      to = _mm256_or_si256(to, in);
+    }
+    m.two |= uint64_t{static_cast<uint32_t>(_mm256_movemask_epi8(two))} << k;
+    m.three |= uint64_t{static_cast<uint32_t>(_mm256_movemask_epi8(three))} << k;
+    m.longer |= uint64_t{static_cast<uint32_t>(_mm256_movemask_epi8(longer))} << k;
+  }
+}
+#endif
+
 void capLevel(int cap) { levelNow.store(cap < 0 || cap > g_detected ? g_detected : cap, std::memory_order_relaxed); }
 
 namespace {
@@ -443,6 +462,66 @@ void unlikeSpan(const uint8_t *table, unsigned &lo, unsigned &hi) {
     if (u != b) lo = std::min(lo, b), hi = b + 1;
   }
 #endif
+}
+
+bool LeadRanges::build(const uint8_t *lens) {
+  count = twos = threes = 0;
+  for (unsigned want : {2u, 3u, 0u}) {  // 0: every other length
+    for (unsigned b = 0; b < 0x100;) {
+      unsigned e = b + 1;
+      while (e < 0x100 && lens[e] == lens[b]) ++e;
+      if (lens[b] != 1 && (want ? lens[b] == want : lens[b] != 2 && lens[b] != 3)) {
+        if (count == kMax) return false;
+        lo[count] = static_cast<uint8_t>(b);
+        span[count] = static_cast<uint8_t>(e - b - 1);  // the last byte's distance from lo
+        std::memset(loV[count], lo[count], 32);
+        std::memset(spanV[count], span[count], 32);
+        ++count;
+      }
+      b = e;
+    }
+    if (want == 2) twos = count;
+    if (want == 3) threes = count - twos;
+  }
+  return true;
+}
+
+LeadMasks leadMasks(const uint8_t *s, const LeadRanges &r, const uint8_t *lens) {
+  LeadMasks m{0, 0, 0};
+#ifdef VL_SIMD_X86
+  if (level() == kAvx2) {
+    leadMasksAvx2(s, r, m);
+    return m;
+  }
+  if (level() == kSse2) {
+    for (unsigned k = 0; k < 64; k += 16) {
+      const __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(s + k)), z = _mm_setzero_si128();
+      auto in = [&](unsigned i) {
+        const __m128i t = _mm_sub_epi8(x, _mm_load_si128(reinterpret_cast<const __m128i *>(r.loV[i])));
+        return _mm_cmpeq_epi8(_mm_min_epu8(t, _mm_load_si128(reinterpret_cast<const __m128i *>(r.spanV[i]))), t);
+      };
+      __m128i two = z, three = z, longer = z;
+      unsigned i = 0;
+      for (; i < r.twos; ++i) two = _mm_or_si128(two, in(i));
+      for (; i < r.twos + r.threes; ++i) three = _mm_or_si128(three, in(i));
+      for (; i < r.count; ++i) longer = _mm_or_si128(longer, in(i));
+      m.two |= uint64_t{static_cast<uint16_t>(_mm_movemask_epi8(two))} << k;
+      m.three |= uint64_t{static_cast<uint16_t>(_mm_movemask_epi8(three))} << k;
+      m.longer |= uint64_t{static_cast<uint16_t>(_mm_movemask_epi8(longer))} << k;
+    }
+    return m;
+  }
+#else
+  (void)r;
+#endif
+  // The scalar level frames no blocks; this stands for processors without a vector unit.
+  for (unsigned i = 0; i < 64; ++i) {
+    const unsigned n = lens[s[i]];
+    m.two |= uint64_t{n == 2} << i;
+    m.three |= uint64_t{n == 3} << i;
+    m.longer |= uint64_t{n != 1 && n != 2 && n != 3} << i;
+  }
+  return m;
 }
 
 size_t mapBytes(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table) {

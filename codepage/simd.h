@@ -99,6 +99,21 @@ void unlikeSpan(const uint8_t *table, unsigned &lo, unsigned &hi);
 // (a multiple of the block, or 0 where the level has no table shuffle).
 size_t mapBytes(const uint8_t *s, VLUChar *d, size_t n, const uint8_t *table);
 
+// The bytes of a lead-byte length table that lead characters of more than one byte, as
+// a few ranges; pages whose leads need more ranges than that have no masks.
+struct LeadRanges {
+  static constexpr unsigned kMax = 8;
+  uint8_t lo[kMax] = {}, span[kMax] = {};
+  alignas(32) uint8_t loV[kMax][32] = {}, spanV[kMax][32] = {};  // each repeated, for the vector tests
+  unsigned count = 0, twos = 0, threes = 0;  // ranges of two-byte leads first, then three-byte ones
+  bool build(const uint8_t *lens);
+};
+// Of 64 bytes, those that lead two-byte, three-byte and longer characters (bit i for s[i]).
+struct LeadMasks {
+  uint64_t two, three, longer;
+};
+LeadMasks leadMasks(const uint8_t *s, const LeadRanges &r, const uint8_t *lens);
+
 // Widens 16 bytes and returns the mask of those in [lo, lo + span), which the caller
 // patches from its table; every other byte is its own value.
 inline unsigned widenBlock(const uint8_t *s, VLUChar *d, uint8_t lo, uint8_t span) {
