@@ -8,6 +8,7 @@
 // the family, the streaming engine included, is `pump` over one such pair.
 #pragma once
 #include <algorithm>
+#include <array>
 #include <bit>
 #include <cstddef>
 #include <cstdint>
@@ -313,9 +314,9 @@ struct WReader {
 // The third bytes of blocks that have none.
 inline constexpr uint8_t kNoThird[256] = {};
 
-// A code page target: the index entry of the last high byte is kept with its bounds, so a
-// run in one block of 256 units is a compare and a table load per unit.
-// Writes 4 bytes at out whatever the character's length: every caller has that room.
+// A single-byte, shift-sensitive or EUC target: the index entry of the last high byte is
+// kept with its bounds, so a run in one block of 256 units is a compare and a table load
+// per unit. Every caller gives kMax bytes of room; none past the character changes.
 // kThirds: for pages with characters of three bytes, where blocks of one- and two-byte
 // values mix with blocks that have a third byte, all of them go the branch-free way; other
 // pages keep a branch on the length, which their runs predict.
@@ -375,7 +376,7 @@ struct IndexEncT {
     return wide(u, out);
   }
   // Blocks with a third byte: two and three bytes without a branch between them (in
-  // Japanese text they alternate at random); all four bytes are stored, n of them count.
+  // Japanese text they alternate at random), and none past them.
   [[gnu::always_inline]] unsigned third(Value u, unsigned i, uint8_t *out) const {
     unsigned v = rd16(tab + 2u * i), t = htab[i];
     if (v <= 0xFF) {
@@ -383,10 +384,12 @@ struct IndexEncT {
       out[0] = static_cast<uint8_t>(v);
       return 1;
     }
-    unsigned n = 2 + (t != 0);
-    uint32_t be = __builtin_bswap32(((t << 16) | v) << (8 * (4 - n)));
-    std::memcpy(out, &be, 4);
-    return n;
+    // The third byte, then the other two behind it: over it when there is none.
+    const bool lead = t != 0;
+    out[0] = static_cast<uint8_t>(t);
+    const auto w = static_cast<uint16_t>(std::endian::native == std::endian::little ? __builtin_bswap16(static_cast<uint16_t>(v)) : v);
+    std::memcpy(out + lead, &w, 2);
+    return 2u + lead;
   }
   // Characters of three or four bytes: the primitives' own reading of the entry.
   [[gnu::noinline]] unsigned wide(Value u, uint8_t *out) const {
@@ -396,6 +399,73 @@ struct IndexEncT {
 
 
 using IndexEnc = IndexEncT<false>;
+
+// A double-byte target. Each unit reads its own block's index entry: in Japanese text the
+// block changes at nearly every character, where keeping the last entry cost a
+// mispredicted branch and a reload. Blocks of 16-bit values write one or two bytes without
+// a branch between them (the lengths alternate at random too): two bytes are stored, n of
+// them count.
+struct DirectEnc {
+  static constexpr unsigned kMax = 4;
+  const VLCodePage *cp;
+  const uint8_t *index, *low;
+  uint8_t sub;
+  // Without the low table every unit is out of bounds: an index of empty blocks says so.
+  static constexpr auto kEmpty = [] {
+    std::array<uint8_t, 256 * cp::kIndexSize> x{};
+    for (size_t h = 0; h < 256; ++h) x[h * cp::kIndexSize + 2] = 1;
+    return x;
+  }();
+  explicit DirectEnc(const VLCodePage *c)
+      : cp(c), index(cp::lowTable(c) ? cp::body(c) + cp::kIndex : kEmpty.data()), low(cp::lowTable(c)),
+        sub(cp::subst(c)) {}
+  // The entry's fields from one load: kind, mask, bounds, then the low table offset.
+  struct Entry {
+    unsigned kind, mask, lo, hi, lowAt;
+    explicit Entry(const uint8_t *e) {
+      uint64_t w;
+      std::memcpy(&w, e, 8);
+      if constexpr (std::endian::native == std::endian::little) {
+        kind = w & 0xFF, mask = (w >> 8) & 0xFF, lo = (w >> 16) & 0xFF, hi = (w >> 24) & 0xFF;
+        lowAt = (w >> 32) & 0xFFFF;
+      } else {
+        kind = static_cast<unsigned>(w >> 56), mask = (w >> 48) & 0xFF, lo = (w >> 40) & 0xFF, hi = (w >> 32) & 0xFF;
+        lowAt = (w >> 16) & 0xFFFF;
+      }
+    }
+  };
+  [[gnu::always_inline]] unsigned operator()(Value u, uint8_t *out) const {
+    const uint8_t *e = index + cp::kIndexSize * ((u >> 8) & 0xFF);
+    const Entry x(e);
+    const unsigned l = u & 0xFF;
+    if (l < x.lo || l > x.hi) {
+      out[0] = sub;
+      return 1;
+    }
+    const uint8_t *tab = low + x.lowAt;
+    const unsigned i = l & x.mask;
+    if (x.kind == 1) {
+      // One byte keeps the byte behind it as it was (the caller's, or what the next
+      // character overwrites), so nothing changes past the output.
+      const unsigned v = rd16(tab + 2u * i), behind = out[1];
+      const bool two = v > 0xFF;
+      constexpr bool little = std::endian::native == std::endian::little;
+      const auto w = static_cast<uint16_t>(little ? (two ? __builtin_bswap16(static_cast<uint16_t>(v)) : v | behind << 8)
+                                                  : (two ? v : v << 8 | behind));
+      std::memcpy(out, &w, 2);
+      return 1u + two;
+    }
+    if (x.kind == 0) {
+      out[0] = tab[i];
+      return 1;
+    }
+    return wide(e, u, out);
+  }
+  // The primitives' own reading of the entry, for the other kinds.
+  [[gnu::noinline]] unsigned wide(const uint8_t *e, Value u, uint8_t *out) const {
+    return static_cast<unsigned>(cp::wToMb(out, cp::indexValue(cp, e, static_cast<VLUChar>(u))));
+  }
+};
 
 struct Utf8Enc {
   static constexpr unsigned kMax = 3;
@@ -450,7 +520,7 @@ struct ByteWriter {
   size_t safe() const { return static_cast<size_t>(end - o) / E::kMax; }
   [[gnu::always_inline]] void fast(Value v) { o += enc(v, o); }
   bool put(Value v) {
-    uint8_t b[8];
+    uint8_t b[8] = {};
     unsigned n = enc(v, b);
     if (n > static_cast<size_t>(end - o)) return false;
     std::memcpy(o, b, n);
@@ -479,7 +549,7 @@ struct ShiftWriter {
     return n + 1 + 0x100;  // the 0x100 marks a state change
   }
   void fast(Value v) {
-    uint8_t b[8];
+    uint8_t b[8] = {};
     unsigned n = form(v, b);
     if (n & 0x100) {
       state ^= 1;
@@ -491,7 +561,7 @@ struct ShiftWriter {
     o += n;
   }
   bool put(Value v) {
-    uint8_t b[8];
+    uint8_t b[8] = {};
     unsigned n = form(v, b);
     bool change = (n & 0x100) != 0;
     n &= 0xFF;
@@ -502,7 +572,7 @@ struct ShiftWriter {
     return true;
   }
   unsigned spill(Value v, uint8_t *buf) {
-    uint8_t b[8];
+    uint8_t b[8] = {};
     unsigned n = form(v, b);
     bool change = (n & 0x100) != 0;
     n &= 0xFF;
@@ -884,6 +954,10 @@ inline auto withByteWriter(const VLCodePage *c, bool shiftAware, uint8_t *o, siz
   }
   if (cp::maxLen(c) >= 3) {
     ByteWriter<IndexEncT<true>> w(c, o, n);
+    return f(w);
+  }
+  if (cp::maxLen(c) == 2) {
+    ByteWriter<DirectEnc> w(c, o, n);
     return f(w);
   }
   ByteWriter<IndexEnc> w(c, o, n);

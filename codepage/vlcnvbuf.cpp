@@ -11,7 +11,7 @@ using namespace vl::cnv;
 // A character that did not fit: as much as fits now, the rest for the next call.
 template <class W>
 uint32_t spill(VLConversion *h, W &w, Value v) {
-  uint8_t buf[8];
+  uint8_t buf[8] = {};
   unsigned n = w.spill(v, buf);
   unsigned now = std::min<size_t>(n, static_cast<size_t>(w.end - w.o));
   std::memcpy(w.o, buf, now);

@@ -78,15 +78,7 @@ int32_t VLCpUnicodeToStr(const VLCodePage *cp, const VLUChar *u, int32_t length,
   // The family's writers: output room is the caller's promise, so it is given as the most
   // the units can take.
   size_t n = untilZero(u, count);
-  // A writer may store a few bytes past the character it writes (a page with three-byte
-  // characters stores four): the last units go through the exact write, so nothing lands
-  // past the terminator.
-  const size_t head = n > 3 ? n - 3 : 0;
-  size_t pos = vl::cnv::withByteWriter(cp, false, out, n * 4, 0, [&](auto &w) {
-    run(w, u, head);
-    for (size_t i = head; i < n; ++i) (void)w.put(u[i]);
-    return static_cast<size_t>(w.o - w.start);
-  });
+  size_t pos = vl::cnv::withByteWriter(cp, false, out, n * 4, 0, [&](auto &w) { return run(w, u, n); });
   out[pos] = 0;
   VL_RET(static_cast<int32_t>(pos));
 }

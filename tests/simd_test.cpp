@@ -199,6 +199,7 @@ TEST_F(SimdConvert, EveryLevelAgreesOnMixedTextAndCutOutput) {
     auto [lo, hi] = ranges[rng() % std::size(ranges)];
     for (size_t k = 1 + rng() % 20; k--;) units.push_back(static_cast<char16_t>(lo + rng() % (hi - lo + 1)));
   }
+  units += u"\u4E00z";  // ends on one byte after two
   // Double-byte pages: Japanese with three-byte characters (954), four-byte ones (964),
   // trail bytes in the ASCII range (932, 950) and none (936, 949).
   for (uint16_t id : {57352, 1252, 850, 37, 932, 954, 964, 936, 949, 950}) {
@@ -233,6 +234,9 @@ TEST_F(SimdConvert, EveryLevelAgreesOnMixedTextAndCutOutput) {
             EXPECT_EQ(VLCpUnicodeToStr(e, text + off, static_cast<int32_t>(units.size() - off), 0, exact.data()), m);
             EXPECT_EQ(0, std::memcmp(exact.data(), b.data(), static_cast<size_t>(m))) << id;
           }
+          // Nothing changes past the output, whatever a writer stores at once.
+          for (int32_t j = m; j < size && j < m + 4; ++j) ASSERT_EQ(b[static_cast<size_t>(j)], 'x') << id << " " << size;
+          for (int32_t j = k; j < size && j < k + 4; ++j) ASSERT_EQ(u[static_cast<size_t>(j)], 0x5555) << id << " " << size;
           b.insert(b.end(), reinterpret_cast<char *>(u.data()), reinterpret_cast<char *>(u.data() + u.size()));
           auto at = seen.find({simd::kScalar, off, size});
           if (at == seen.end()) {
