@@ -228,12 +228,15 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
 // 16 bytes a step: lead and continuation masks say where each character starts; a block
 // whose continuation bytes are exactly those its leads call for frames the same as the
 // byte-by-byte decoder, so its values are computed for every position at once and the
-// continuation positions squeezed out. A character that runs past the block is left to
-// the next one.
+// continuation positions squeezed out. A character whose lead is in the block takes its
+// last bytes from the next one, which then expects them: the step is always 16 bytes, so
+// no step waits for the masks of the one before.
 [[gnu::target("avx2")]] Moved utf8ToUtf16Avx2(const uint8_t *s, VLUChar *d, size_t n) {
   const __m256i low6 = _mm256_set1_epi16(0x3F), low5 = _mm256_set1_epi16(0x1F);
   const __m256i ascii = _mm256_set1_epi16(0x80), two = _mm256_set1_epi16(0xDF);
   size_t in = 0, out = 0;
+  unsigned carry = 0;  // the first bytes of this block that a character of the last one took
+  // Up to 16 characters a step, and 18 bytes read: s holds 4n bytes.
   while (out + 16 <= n) {
     const uint8_t *p = s + in;
     __m128i x = _mm_loadu_si128(reinterpret_cast<const __m128i *>(p));
@@ -249,9 +252,9 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
     unsigned lead = high & static_cast<unsigned>(_mm_movemask_epi8(_mm_slli_epi16(x, 1)));
     unsigned three = lead & static_cast<unsigned>(_mm_movemask_epi8(_mm_slli_epi16(x, 2)));
     unsigned cont = high & ~lead;
-    if ((((lead << 1) | (three << 2)) ^ cont) & 0xFFFF) break;
-    unsigned cut = lead >> 15 ? 15 : (three >> 14) & 1 ? 14 : 16;
-    unsigned keep = ~cont & ((1u << cut) - 1);
+    const unsigned expect = (lead << 1) | (three << 2) | carry;
+    if ((expect ^ cont) & 0xFFFF) break;
+    unsigned keep = ~cont & 0xFFFF;
     __m256i b1 = _mm256_cvtepu8_epi16(_mm_loadu_si128(reinterpret_cast<const __m128i *>(p + 1)));
     __m256i v = _mm256_or_si256(_mm256_slli_epi16(_mm256_and_si256(b0, low5), 6), _mm256_and_si256(b1, low6));
     if (three) {  // Western text seldom has any
@@ -266,8 +269,11 @@ Moved utf16ToUtf8Sse2(const VLUChar *s, uint8_t *d, size_t n) {
     out += static_cast<unsigned>(__builtin_popcount(k0));
     storeShuffled(d + out, _mm256_extracti128_si256(v, 1), kShuffles.units[k1]);
     out += static_cast<unsigned>(__builtin_popcount(k1));
-    in += cut;
+    in += 16;
+    carry = expect >> 16;
   }
+  // Where the steps stopped, after the bytes the last character took from the next block.
+  in += (carry & 1) + (carry >> 1 & 1);
   return {in, out};
 }
 
