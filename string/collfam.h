@@ -204,43 +204,6 @@ struct Source {
   bool done() const { return pending == kNoUnit && rem == 0; }
 };
 
-// Key of count UTF-16 units into dst; builds in dst when it holds the work area. Returns
-// the key length (also when it did not fit, and nothing was written), -1 without memory.
-inline int32_t genKey(const VLObjEntry *so, uint8_t *dst, uint32_t dstLen, const uint16_t *u, uint32_t count,
-                      bool noTertiary = false) {
-  if (!dst) dstLen = 0;
-  if (count == 0) {
-    if (dstLen > 2) std::memset(dst, 0, 3);
-    return 3;
-  }
-  const uint32_t need = workSize(count);
-  const uint32_t skip = dst ? (kGrain - reinterpret_cast<uintptr_t>(dst) % kGrain) % kGrain : 0;
-  const bool inPlace = dstLen > skip && dstLen - skip >= need;
-  Block<uint8_t> own(inPlace ? nullptr : static_cast<uint8_t *>(alloc(need)));
-  if (!inPlace && !own) return -1;
-  uint8_t *area = inPlace ? dst + skip : own.get();
-  Levels lv;
-  lv.init(area, count);
-  lv.noTertiary = noTertiary;
-  Weights w;
-  for (uint32_t i = 0; i < count; ++i) {
-    const auto pos = static_cast<uint16_t>(i + 1);
-    if (sort::hasCombinations(so) && i + 1 < count && sort::combinationOf(so, u[i], u[i + 1], &w)) {
-      lv.insertAll(w, 1, pos);
-      ++i;
-      continue;
-    }
-    lv.insertAll(w, sort::weightsOf(so, u[i], &w), pos);
-  }
-  lv.finish(so);
-  const uint32_t len = lv.keyLength();
-  if (len <= dstLen) {
-    lv.write(dst);
-    if (inPlace) std::memset(dst + len, 0, dstLen - len);
-  }
-  return static_cast<int32_t>(len);
-}
-
 // Walks both strings at once, deciding on the first primary difference while every
 // primary so far was placed forward; otherwise compares the finished levels.
 template <class F>
@@ -413,6 +376,45 @@ inline const Quick &quickOf(const VLLocale *l) {
     lastKey = k;
   }
   return *last;
+}
+
+// Key of count UTF-16 units into dst by the sort of q; builds in dst when it holds the work area. Returns
+// the key length (also when it did not fit, and nothing was written), -1 without memory.
+inline int32_t genKey(const Quick &q, uint8_t *dst, uint32_t dstLen, const uint16_t *u, uint32_t count,
+                      bool noTertiary = false) {
+  const VLObjEntry *so = q.so;
+  if (!dst) dstLen = 0;
+  if (count == 0) {
+    if (dstLen > 2) std::memset(dst, 0, 3);
+    return 3;
+  }
+  const uint32_t need = workSize(count);
+  const uint32_t skip = dst ? (kGrain - reinterpret_cast<uintptr_t>(dst) % kGrain) % kGrain : 0;
+  const bool inPlace = dstLen > skip && dstLen - skip >= need;
+  Block<uint8_t> own(inPlace ? nullptr : static_cast<uint8_t *>(alloc(need)));
+  if (!inPlace && !own) return -1;
+  uint8_t *area = inPlace ? dst + skip : own.get();
+  Levels lv;
+  lv.init(area, count);
+  lv.noTertiary = noTertiary;
+  Weights w;
+  for (uint32_t i = 0; i < count; ++i) {
+    const auto pos = static_cast<uint16_t>(i + 1);
+    // Only a unit that starts some combination is tried with the next (most start none).
+    if (i + 1 < count && q.starts(u[i]) && sort::combinationOf(so, u[i], u[i + 1], &w)) {
+      lv.insertAll(w, 1, pos);
+      ++i;
+      continue;
+    }
+    lv.insertAll(w, sort::weightsOf(so, u[i], &w), pos);
+  }
+  lv.finish(so);
+  const uint32_t len = lv.keyLength();
+  if (len <= dstLen) {
+    lv.write(dst);
+    if (inPlace) std::memset(dst + len, 0, dstLen - len);
+  }
+  return static_cast<int32_t>(len);
 }
 
 // The primary weights of one string, one at a time: one-unit characters below 0x100
@@ -612,7 +614,7 @@ int32_t xfrm(VLLocale *l, F f, uint8_t *dst, int32_t dstLen, const U<F> *src, in
   uint32_t count = 0, len;
   uint16_t u;
   while (s.read(&u, &len)) units[count++] = u;
-  const int32_t k = genKey(l->sort, dst, room, units, count, opts != 0);
+  const int32_t k = genKey(quickOf(l), dst, room, units, count, opts != 0);
   if (k < 0) setRc(l, VL_RC_NOMEM);
   return k;
 }

@@ -8,6 +8,6 @@ int32_t VLStrGenSortKey(VLLocale *locale, unsigned char *dst, int32_t dstLen, co
   using namespace vl::coll;
   VLLocale *l = vl::orDefault(locale);
   if (!l || !usesSort(l) || count < 0 || (count && !units)) VL_RET(int32_t{-1});
-  VL_RET(genKey(l->sort, dst, dst && dstLen > 0 ? static_cast<uint32_t>(dstLen) : 0, units,
+  VL_RET(genKey(quickOf(l), dst, dst && dstLen > 0 ? static_cast<uint32_t>(dstLen) : 0, units,
                 static_cast<uint32_t>(count)));
 }
