@@ -226,13 +226,20 @@ TEST_F(Pages, Strings) {
     out.resize(static_cast<size_t>(n) + (&c.page == &sh ? 0 : 1));
     EXPECT_EQ(out, c.out) << c.page.entry.id << " " << c.in[0];
   }
-  // The 0 that ends the input is found at any place within or after a block of units.
-  for (size_t at = 0; at <= 40; ++at) {
-    Units in(40, 0x41);
+  // The 0 that ends the input is found at any place within or after a block of units, and
+  // on either side of the stretches the input is searched in.
+  std::vector<size_t> zeros;
+  for (size_t at = 0; at <= 40; ++at) zeros.push_back(at);
+  for (size_t at : {4095, 4096, 4097, 8191, 8192, 8193, 9000}) zeros.push_back(at);
+  for (size_t at : zeros) {
+    const size_t size = at <= 40 ? 40 : 9000;
+    Units in(size, 0x41);
     if (at < in.size()) in[at] = 0;
-    Bytes out(48, 0xEE);
-    EXPECT_EQ(VLCpUnicodeToStr(db.cp(), in.data(), 40, 0, out.data()), static_cast<int32_t>(at)) << "0 at " << at;
+    Bytes out(size + 8, 0xEE);
+    EXPECT_EQ(VLCpUnicodeToStr(db.cp(), in.data(), static_cast<int32_t>(size), 0, out.data()), static_cast<int32_t>(at))
+        << "0 at " << at;
     EXPECT_EQ(out[at], 0) << "0 at " << at;
+    EXPECT_EQ(out[at + 1], 0xEE) << "0 at " << at;
   }
 }
 
