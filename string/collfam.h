@@ -367,15 +367,20 @@ struct QuickKey {
 }
 // The last one found sits beside its key, so a repeated call only compares.
 inline const Quick &quickOf(const VLLocale *l) {
-  static thread_local QuickKey lastKey{};
-  static thread_local const Quick *last = nullptr;
+  // One thread-local record, so the shared library looks its address up once a call.
+  struct Last {
+    QuickKey key;
+    const Quick *quick;
+  };
+  static thread_local Last last{};
   const QuickKey k{l->sort, __atomic_load_n(&l->sort->section[0], __ATOMIC_ACQUIRE), l->codePage,
                    bytesOf(l).lenTab, store::unloads.load(std::memory_order_acquire)};
-  if (!last || !(k == lastKey)) {
-    last = quickFind(k);
-    lastKey = k;
+  Last &t = last;
+  if (!t.quick || !(k == t.key)) {
+    t.quick = quickFind(k);
+    t.key = k;
   }
-  return *last;
+  return *t.quick;
 }
 
 // Key of count UTF-16 units into dst by the sort of q; builds in dst when it holds the work area. Returns
