@@ -94,7 +94,6 @@ struct TrieUni {
   }
 };
 
-
 // UTF-8 by arithmetic; one-byte characters still through the table.
 struct Utf8Uni {
   const uint8_t *sb;
@@ -194,8 +193,8 @@ struct MbReader {
   }
   unsigned need(uint8_t lead) const { return len(lead); }
   Value decode(const uint8_t *q, unsigned n) const { return n == 1 ? d.one(q[0]) : d.multi(q, n); }
-  // Lead bytes of long characters as ranges, for framing a block at a time; 0 when none
-  // or too many (once known: 1 ranges usable, 0 not).
+  // Lead bytes of long characters as ranges, for framing a block at a time: -1 until
+  // known, then 0 when there are none or too many.
   int framed = -1;
   simd::LeadRanges leads;
   bool frames() requires requires { len.t; } {
@@ -403,8 +402,8 @@ using IndexEnc = IndexEncT<false>;
 // A double-byte target. Each unit reads its own block's index entry: in Japanese text the
 // block changes at nearly every character, where keeping the last entry cost a
 // mispredicted branch and a reload. Blocks of 16-bit values write one or two bytes without
-// a branch between them (the lengths alternate at random too): two bytes are stored, n of
-// them count.
+// a branch between them (the lengths alternate at random too): two bytes are stored, the
+// second as it was when the character has one.
 struct DirectEnc {
   static constexpr unsigned kMax = 4;
   const VLCodePage *cp;
@@ -549,7 +548,7 @@ struct ShiftWriter {
     return n + 1 + 0x100;  // the 0x100 marks a state change
   }
   void fast(Value v) {
-    uint8_t b[8] = {};
+    uint8_t b[8];
     unsigned n = form(v, b);
     if (n & 0x100) {
       state ^= 1;
@@ -561,7 +560,7 @@ struct ShiftWriter {
     o += n;
   }
   bool put(Value v) {
-    uint8_t b[8] = {};
+    uint8_t b[8];
     unsigned n = form(v, b);
     bool change = (n & 0x100) != 0;
     n &= 0xFF;
@@ -572,7 +571,7 @@ struct ShiftWriter {
     return true;
   }
   unsigned spill(Value v, uint8_t *buf) {
-    uint8_t b[8] = {};
+    uint8_t b[8];
     unsigned n = form(v, b);
     bool change = (n & 0x100) != 0;
     n &= 0xFF;
